@@ -73,9 +73,11 @@ template <class A, class B> struct tied_pair {
 template <class A, class B> tied_pair<A, B> tie(A& a, B& b) { return {a, b}; }
 
 template <class T, T... I> struct integer_sequence {};
-template <class T, T N, T... I> struct make_sequence_c : make_sequence_c<T, N - 1, N - 1, I...> {};
-template <class T, T... I> struct make_sequence_c<T, 0, I...> { using type = integer_sequence<T, I...>; };
-template <class T, T N> using make_integer_sequence = typename make_sequence_c<T, N>::type;
+#if defined(__clang__)
+template <class T, T N> using make_integer_sequence = __make_integer_seq<integer_sequence, T, N>;
+#else
+template <class T, T N> using make_integer_sequence = integer_sequence<T, __integer_pack(N)...>;
+#endif
 
 // Lock tags.
 struct try_lock_c {};

@@ -1,0 +1,53 @@
+// The mode ladder: from an exported function to the kernel variant of the best mode the
+// process can hold, among the modes the function allows.
+#ifndef CORVANE_CORE_DISPATCH_H
+#define CORVANE_CORE_DISPATCH_H
+
+#include "core/hvx_modes.h"
+#include "core/membuf.h"
+#include "core/result.h"
+
+namespace hvx {
+enum allowed_mode : int { NONE = 0, SCALAR = 1, SHVX = 2, DHVX = 4, HVX = 6, ALL = 7 };
+}
+
+namespace {
+
+// Runs Kernel<M>::run(mode_c<M>::instance, args...) in the best allowed mode. Ladders of
+// modes outside Allowed are not compiled.
+template <template <hvx::mode_enum> class Kernel, int Allowed, class... Args>
+AEEResult invokeKernel(Args&&... args) {
+  using namespace hvx;
+  if (!IsInitialized()) return RESULT_NOT_READY;
+  if constexpr (Allowed == SCALAR) {
+    return Kernel<Scalar>::run(mode_c<Scalar>::instance, nstd::forward<Args>(args)...);
+  } else {
+    {
+      scoped_reservation reservation = reserve_all();
+      const int reserved = scoped_reservation::query_reserved();
+      if constexpr ((Allowed & DHVX) != 0) {
+        if (reserved >= 2) {
+          mode_lock guard = lock(mode_c<DualHVX>::instance);
+          if (!guard.owns_mode()) return RESULT_NOT_READY;
+          return Kernel<DualHVX>::run(mode_c<DualHVX>::instance, nstd::forward<Args>(args)...);
+        }
+      }
+      if constexpr ((Allowed & SHVX) != 0) {
+        if (reserved >= 1) {
+          mode_lock guard = lock(mode_c<SingleHVX>::instance);
+          if (!guard.owns_mode()) return RESULT_NOT_READY;
+          return Kernel<SingleHVX>::run(mode_c<SingleHVX>::instance, nstd::forward<Args>(args)...);
+        }
+      }
+    }  // a scalar run holds no units
+    if constexpr ((Allowed & SCALAR) != 0) {
+      return Kernel<Scalar>::run(mode_c<Scalar>::instance, nstd::forward<Args>(args)...);
+    } else {
+      return RESULT_NOT_READY;
+    }
+  }
+}
+
+}  // namespace
+
+#endif

@@ -1,0 +1,67 @@
+// The simulated DSP platform: what is shared by the host and hexagon builds, and the
+// few primitives each build supplies (one mutex with a change signal, per-thread state,
+// the environment, a log writer, a clock). Nothing here uses the C++ library, so the
+// same logic runs in the freestanding hexagon runtime.
+#ifndef CORVANE_PLATFORM_SIM_H
+#define CORVANE_PLATFORM_SIM_H
+
+#include <stddef.h>
+#include <stdint.h>
+
+#include "corvane_platform.h"
+
+namespace sim {
+
+constexpr int kMaxTlsKeys = 16;
+constexpr int kDefaultUnits = 4;
+
+// What the platform knows of one thread.
+struct thread_state {
+  int locked_units;  // units held by this thread's vector context, 0 if none
+  int locked_vlen;   // its vector length in bytes
+  void* tls[kMaxTlsKeys];
+};
+
+// ---- supplied by each build ----
+thread_state* current_thread();  // the calling thread's state, zeroed on first use
+void lock_state();               // the platform's one mutex
+void unlock_state();
+void wait_state_changed();       // with the mutex held: sleep until notified, mutex re-held
+void notify_state_changed();
+const char* env(const char* name);  // start-up configuration, null if unset
+void write_log(const char* text, size_t length);
+uint64_t now_us();
+
+// ---- shared state, guarded by lock_state() ----
+struct state {
+  int total_units;         // units the platform has
+  int reserved;            // units this process holds
+  int used;                // units held by locked contexts
+  int forced_lock_result;  // 0, or what dspCV_hvx_lock answers instead of locking
+  bool fail_power_requests;
+  bool fail_hvx_power_on;
+  bool compute_not_ok;
+  bool startup_checked;  // the environment's start-up faults were read
+  int startup_fault;     // 0 none, 1 init fails, 2 the first power-on fails
+  int initialised;       // dspCV_initQ6 minus dspCV_deinitQ6 calls
+  int hvx_powered;       // power-on minus power-off calls
+  corvane_platform_counters counters;
+  int init_attributes[4];  // values of the last start-up, by attribute ID
+  corvane_log_sink sink;
+  void* sink_context;
+};
+state& the_state();
+
+struct guard {
+  guard() { lock_state(); }
+  ~guard() { unlock_state(); }
+  guard(const guard&) = delete;
+  guard& operator=(const guard&) = delete;
+};
+
+// Sends one finished line to the sink or the log writer.
+void emit_log(int level, const char* file, int line, const char* text);
+
+}  // namespace sim
+
+#endif

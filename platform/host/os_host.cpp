@@ -1,0 +1,57 @@
+// The host's primitives under the simulated platform: a std::mutex with a condition
+// variable, thread_local thread state, getenv, stderr, the steady clock.
+#include <chrono>
+#include <condition_variable>
+#include <cstdio>
+#include <cstdlib>
+#include <mutex>
+
+#include "sim.h"
+
+namespace sim {
+
+void run_tls_destructors(thread_state* t);
+
+namespace {
+
+std::mutex& state_mutex() {
+  static std::mutex m;
+  return m;
+}
+std::condition_variable& state_changed() {
+  static std::condition_variable cv;
+  return cv;
+}
+// The lock held by the current thread, so that waiting can release it.
+thread_local std::unique_lock<std::mutex> held;
+
+struct host_thread {
+  thread_state state = {};
+  ~host_thread() { run_tls_destructors(&state); }
+};
+
+}  // namespace
+
+thread_state* current_thread() {
+  thread_local host_thread t;
+  return &t.state;
+}
+
+void lock_state() { held = std::unique_lock<std::mutex>(state_mutex()); }
+
+void unlock_state() { held.unlock(); }
+
+void wait_state_changed() { state_changed().wait(held); }
+
+void notify_state_changed() { state_changed().notify_all(); }
+
+const char* env(const char* name) { return std::getenv(name); }
+
+void write_log(const char* text, size_t length) { std::fwrite(text, 1, length, stderr); }
+
+uint64_t now_us() {
+  using namespace std::chrono;
+  return static_cast<uint64_t>(duration_cast<microseconds>(steady_clock::now().time_since_epoch()).count());
+}
+
+}  // namespace sim
