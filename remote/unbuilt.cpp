@@ -1,0 +1,108 @@
+// The exported functions of the methods whose kernels are not built yet: each answers 20
+// (not implemented). A kernel that lands defines its function beside the kernel, removes
+// its line here and marks its row `built` in method_table.h.
+#include "core/result.h"
+#include "remote/corvane.h"
+
+namespace {
+constexpr AEEResult kNotBuilt = hvx::RESULT_NOT_IMPLEMENTED;
+}
+
+extern "C" {
+
+AEEResult corvane_vadd_mm(const uint8_t*, int, uint8_t, const uint8_t*, int, uint8_t, const uint8_t*, int, uint8_t*,
+    int, uint8_t) { return kNotBuilt; }
+AEEResult corvane_vsub_mm(const uint8_t*, int, uint8_t, const uint8_t*, int, uint8_t, const uint8_t*, int, uint8_t*,
+    int, uint8_t) { return kNotBuilt; }
+AEEResult corvane_vmul_mm(const uint8_t*, int, uint8_t, const uint8_t*, int, uint8_t, uint8_t*, int,
+    uint8_t) { return kNotBuilt; }
+AEEResult corvane_vmul_scale(const uint8_t*, int, uint8_t, int32_t, uint8_t*, int, uint8_t) { return kNotBuilt; }
+AEEResult corvane_vdiv_mm(const uint8_t*, int, uint8_t, const uint8_t*, int, uint8_t, uint8_t*, int,
+    uint8_t) { return kNotBuilt; }
+AEEResult corvane_vdiv_scale(int32_t, const uint8_t*, int, uint8_t, uint8_t*, int, uint8_t) { return kNotBuilt; }
+AEEResult corvane_hvx_sum(const uint8_t*, int, int32_t*, int, int32_t, int32_t, int32_t) { return kNotBuilt; }
+AEEResult corvane_deinterleave2C(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    corvane_mbuf*) { return kNotBuilt; }
+AEEResult corvane_deinterleave3C(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    corvane_mbuf*, corvane_mbuf*) { return kNotBuilt; }
+AEEResult corvane_deinterleave4C(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    corvane_mbuf*, corvane_mbuf*, corvane_mbuf*) { return kNotBuilt; }
+AEEResult corvane_convertScaleAbs(const corvane_mbufd*, const corvane_mbufd*, const corvane_mbuf*, corvane_mbuf*,
+    double, double) { return kNotBuilt; }
+AEEResult corvane_sobel8u(const uint8_t*, int, int32_t, int32_t, int32_t, uint8_t*, int,
+    uint32_t) { return kNotBuilt; }
+AEEResult corvane_sobel16s(const uint8_t*, int, int32_t, int32_t, int32_t, int16_t*, int, uint32_t,
+    uint32_t) { return kNotBuilt; }
+AEEResult corvane_sobel32f(const uint8_t*, int, int32_t, int32_t, int32_t, int32_t*, int, uint32_t,
+    uint32_t) { return kNotBuilt; }
+AEEResult corvane_conv3x3a328u(const uint8_t*, int, int32_t, int32_t, int32_t, const uint8_t*, int, int32_t,
+    uint8_t*, int, int32_t) { return kNotBuilt; }
+AEEResult corvane_cornerMinEigenVal(const uint8_t*, int, int32_t, int32_t, int32_t, int32_t, int32_t, int32_t*, int,
+    int32_t*, int, int32_t*, int, int32_t*, int, int32_t*, int, int32_t*, int, int32_t*) { return kNotBuilt; }
+AEEResult corvane_houghlines(const uint8_t*, int, uint32_t, uint32_t, uint32_t, float, uint32_t, uint32_t*, fcvLine*,
+    int) { return kNotBuilt; }
+AEEResult corvane_median3x3(const uint8_t*, int, uint32_t, uint32_t, uint32_t, uint8_t*, int, uint32_t,
+    uint32_t) { return kNotBuilt; }
+AEEResult corvane_warp_perspective(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    const corvane_mbufd*, const corvane_mbuf*, int32_t, int32_t,
+    const corvane_border_value_info*) { return kNotBuilt; }
+AEEResult corvane_warp_affine(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    const corvane_mbufd*, const corvane_mbuf*, int32_t, int32_t,
+    const corvane_border_value_info*) { return kNotBuilt; }
+AEEResult corvane_remap(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    const corvane_mbuf*, const corvane_mbuf*, int32_t, int32_t, int32_t, int32_t, int32_t, int32_t, int32_t,
+    const corvane_border_value_info*) { return kNotBuilt; }
+AEEResult corvane_resize(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, uint32_t,
+    corvane_mbuf*) { return kNotBuilt; }
+AEEResult corvane_ppht_lines(uint8_t*, int, uint32_t, uint32_t, uint32_t, uint32_t, uint32_t, const uint8_t*, int,
+    int32_t, int32_t, int32_t, uint32_t*) { return kNotBuilt; }
+AEEResult corvane_cvtColor(const corvane_mbufd*, const corvane_mbuf*, uint8_t, const corvane_mbufd*,
+    corvane_mbuf*) { return kNotBuilt; }
+AEEResult corvane_cornerMinEigenVal_v2(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbuf*,
+    const corvane_mbufd*, corvane_mbuf*, int32_t, int32_t) { return kNotBuilt; }
+AEEResult corvane_cornerMinEigenValFP(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbuf*,
+    const corvane_mbufd*, corvane_mbuf*, int32_t, int32_t) { return kNotBuilt; }
+AEEResult corvane_cornerHarris(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbuf*, const corvane_mbufd*,
+    corvane_mbuf*, int32_t, float, int32_t) { return kNotBuilt; }
+AEEResult corvane_gaussianBlur(const corvane_mbufd*, const corvane_mbufd*, const corvane_mbuf*, corvane_mbuf*,
+    int32_t) { return kNotBuilt; }
+AEEResult corvane_goodFeaturesToTrack(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*,
+    const corvane_mbuf*, float, float, int32_t, uint8_t, float, int32_t, const corvane_mbufd*, corvane_mbuf*,
+    corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    const corvane_mbufd*, corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, int32_t*) { return kNotBuilt; }
+AEEResult corvane_LSC(const uint8_t*, int, uint8_t*, int, uint32_t, uint32_t, const uint8_t*, int, const uint8_t*,
+    int) { return kNotBuilt; }
+AEEResult corvane_morphOp(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, int32_t,
+    int32_t, int32_t, int32_t, int32_t, uint32_t) { return kNotBuilt; }
+AEEResult corvane_morphologyEx(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    const corvane_mbufd*, corvane_mbuf*, int32_t, int32_t, int32_t, int32_t, int32_t, uint32_t) { return kNotBuilt; }
+AEEResult corvane_boxfilter(const corvane_mbufd*, const corvane_mbuf*, int32_t, int32_t, int32_t, uint8_t,
+    const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*) { return kNotBuilt; }
+AEEResult corvane_median_blur_3x3(const corvane_mbufd*, const corvane_mbuf*, corvane_mbuf*) { return kNotBuilt; }
+AEEResult corvane_pyrDown(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*,
+    corvane_mbuf*) { return kNotBuilt; }
+AEEResult corvane_pyrUp(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    const corvane_mbufd*, corvane_mbuf*) { return kNotBuilt; }
+AEEResult corvane_clearHist(const corvane_mbufd*, corvane_mbuf*) { return kNotBuilt; }
+AEEResult corvane_calcHist_8u1d(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    int32_t, const uint8_t*, int) { return kNotBuilt; }
+AEEResult corvane_calcHist(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    const uint8_t*, int, const uint8_t*, int) { return kNotBuilt; }
+AEEResult corvane_thresh(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, int32_t,
+    int32_t, uint32_t) { return kNotBuilt; }
+AEEResult corvane_integrate(const uint8_t*, int, int32_t, int32_t, int32_t, uint32_t*, int,
+    int32_t) { return kNotBuilt; }
+AEEResult corvane_filter2D(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    const int16_t*, int, int32_t) { return kNotBuilt; }
+AEEResult corvane_sobel(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, int32_t,
+    int32_t, int32_t, int32_t, int32_t) { return kNotBuilt; }
+AEEResult corvane_trackLK(const uint8_t*, int, const uint8_t*, int, uint32_t, uint32_t, float*, int, float*, int,
+    float*, int, int32_t*, int, int32_t, uint32_t, uint32_t, int32_t, int32_t, float, int32_t,
+    int32_t) { return kNotBuilt; }
+AEEResult corvane_opticalFlow(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, const corvane_mbuf*,
+    const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*,
+    const corvane_mbuf*, const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
+    const corvane_mbufd*, corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, int32_t, int32_t, int32_t, float,
+    int32_t, int32_t, int32_t, float, int32_t) { return kNotBuilt; }
+
+}  // extern "C"
