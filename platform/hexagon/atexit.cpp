@@ -44,8 +44,9 @@ void __cxa_pure_virtual() {
 
 }  // extern "C"
 
-// Objects with a virtual destructor reference the sized and unsized deletes even if
-// nothing is ever deleted: there is no heap for new.
+// Objects with a virtual destructor reference the deletes even if nothing is ever
+// deleted (there is no heap for new). The shared object's version script keeps them
+// local: operator delete cannot be declared hidden.
 void operator delete(void*) noexcept {}
 void operator delete(void*, size_t) noexcept {}
 
