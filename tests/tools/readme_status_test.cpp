@@ -1,0 +1,25 @@
+// The README's status table must say, for every method, what the method table says.
+#include <gtest/gtest.h>
+
+#include <fstream>
+#include <sstream>
+#include <string>
+
+#include "remote/method_table.h"
+
+namespace {
+
+TEST(Readme, StatusTableAgreesWithTheMethodTable) {
+  std::ifstream readme(CORVANE_README);
+  ASSERT_TRUE(readme) << CORVANE_README;
+  std::stringstream text;
+  text << readme.rdbuf();
+  const std::string all = text.str();
+  for (const corvane::remote::method_info& m : corvane::remote::kMethods) {
+    const std::string row = "| " + std::to_string(m.number) + " | `" + m.name + "` | " +
+                            (m.built ? "built |" : "not yet built (answers 20) |");
+    EXPECT_NE(std::string::npos, all.find(row)) << "README lacks: " << row;
+  }
+}
+
+}  // namespace
