@@ -36,7 +36,7 @@ constexpr size_t kPrimaryCapacity = 512;
 
 }  // namespace
 
-AEEResult invoke(int number, const c_arg* args) {
+AEEResult invoke(int number, const c_arg* args, transport via) {
   if (number < 0 || number >= remote::kMethodCount) throw std::out_of_range("corvane::client::invoke: no such method");
   const remote::method_plan& p = remote::kPlans[number];
   std::array<uint8_t, kPrimaryCapacity> prim_in{};
@@ -90,7 +90,7 @@ AEEResult invoke(int number, const c_arg* args) {
 
   const int method_field = number < remote::kFirstEscapedMethod ? number : remote::kFirstEscapedMethod;
   const uint32_t sc = REMOTE_SCALARS_MAKE(method_field, p.in_bufs, p.out_bufs);
-  const int result = corvane_skel_invoke(sc, pra.empty() ? nullptr : pra.data());
+  const int result = via(sc, pra.empty() ? nullptr : pra.data());
   if (result != 0) return result;
 
   a = args;

@@ -33,8 +33,12 @@ struct c_arg {
   uint64_t bits;
 };
 
-// Marshals and runs method `number`; `args` holds the exported function's arguments in order.
-AEEResult invoke(int number, const c_arg* args);
+// What carries a marshalled call: corvane_skel_invoke, or a stand-in that looks at the call.
+using transport = int (*)(uint32_t sc, remote_arg* pra);
+
+// Marshals method `number` and hands it to `via`; `args` holds the exported function's
+// arguments in order.
+AEEResult invoke(int number, const c_arg* args, transport via = &corvane_skel_invoke);
 
 namespace detail {
 
@@ -53,18 +57,23 @@ template <class T> c_arg pack(T value) {
 // Converts as a call to the exported function would.
 template <class T> T as_parameter(T value) { return value; }
 
-template <int N, size_t... J, class... A> AEEResult call(std::index_sequence<J...>, A&&... args) {
+template <int N, size_t... J, class... A>
+AEEResult call(transport via, std::index_sequence<J...>, A&&... args) {
   const c_arg packed[] = {pack(as_parameter<remote::c_arg_t<N, J>>(std::forward<A>(args)))..., c_arg{nullptr, 0}};
-  return invoke(N, packed);
+  return invoke(N, packed, via);
 }
 
 }  // namespace detail
 
-template <int N, class... A> AEEResult call(A&&... args) {
+template <int N, class... A> AEEResult call_via(transport via, A&&... args) {
   static_assert(N >= 0 && N < remote::kMethodCount, "no such method");
   static_assert(sizeof...(A) == size_t(remote::kPlans[N].num_args),
                 "a call takes the arguments of the method's exported function");
-  return detail::call<N>(std::index_sequence_for<A...>{}, std::forward<A>(args)...);
+  return detail::call<N>(via, std::index_sequence_for<A...>{}, std::forward<A>(args)...);
+}
+
+template <int N, class... A> AEEResult call(A&&... args) {
+  return call_via<N>(&corvane_skel_invoke, std::forward<A>(args)...);
 }
 
 }  // namespace client

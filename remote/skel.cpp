@@ -15,6 +15,7 @@
 #include "remote.h"
 #include "remote/corvane.h"
 #include "remote/signature.h"
+#include "remote/unmarshal.h"
 #include "remote/wire_plan.h"
 
 namespace corvane {
@@ -26,25 +27,6 @@ constexpr int kNoSuchMethod = hvx::RESULT_NOT_IMPLEMENTED;
 
 static_assert(sizeof(corvane_mbufd) == 36 && sizeof(corvane_border_value_info) == 32,
               "records must have their wire size");
-
-// Where one parameter lives during the call.
-struct arg_slot {
-  union {
-    corvane_mbufd desc;
-    corvane_mbuf buf;  // an imbuf or ombuf: the caller's buffer with the length word as memLen
-    corvane_border_value_info border;
-    uint8_t u8;
-    int32_t i32;
-    uint32_t u32;
-    uint64_t u64;
-    float f32;
-    double f64;
-  } v;
-  void* data;             // a sequence: the caller's buffer
-  int len;                // its length in elements, as the primary input gives it
-  const void* copy_from;  // an inrout sequence in two buffers: its input, copied to data before the call
-  size_t copy_bytes;
-};
 
 // The transport does not promise aligned buffers: fields are read and written one byte at
 // a time, little-endian.
@@ -124,7 +106,8 @@ bool unmarshal_sequence(const param_plan& q, const uint8_t* prim, remote_arg* in
   return true;
 }
 
-// Checks the whole call and fills the slots; writes nothing that the caller can see.
+}  // namespace
+
 int unmarshal(const method_plan& p, uint32_t sc, remote_arg* pra, arg_slot* slots, uint8_t** prim_out) {
   const uint32_t n_in = REMOTE_SCALARS_INBUFS(sc);
   const uint32_t total =
@@ -160,6 +143,8 @@ int unmarshal(const method_plan& p, uint32_t sc, remote_arg* pra, arg_slot* slot
   }
   return 0;
 }
+
+namespace {
 
 // An inrout sequence given in two buffers starts as a copy of its input.
 void copy_inrout_inputs(const method_plan& p, const arg_slot* slots) {
