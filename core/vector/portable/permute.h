@@ -1,0 +1,116 @@
+// Shuffles, deals and byte networks: the portable definition of each operation.
+// Lanes that move across the whole vector are plain lane loops over bytes.
+#ifndef CORVANE_CORE_VECTOR_PORTABLE_PERMUTE_H
+#define CORVANE_CORE_VECTOR_PORTABLE_PERMUTE_H
+
+#include "core/vector/portable/lanes.h"
+
+namespace hvx {
+CORVANE_PORTABLE_INLINE namespace portable {
+
+// vshuffe: r[2i] = v[2i], r[2i+1] = u[2i]; 8- and 16-bit lanes.  HVX: vshuffe(Vu,Vv)
+template <class V> inline if_lanes<V, uint8_t, int8_t, uint16_t, int16_t> vshuffe(V u, V v) {
+  typedef typename lane_traits<wide_lane<typename V::lane_t>>::unsigned_t W;
+  return map_chunks<W, V>([](chunk<W> a, chunk<W> b) { return pack_even_odd<W>(b, a); }, u, v);
+}
+
+// vshuffo: r[2i] = v[2i+1], r[2i+1] = u[2i+1]; 8- and 16-bit lanes.  HVX: vshuffo(Vu,Vv)
+template <class V> inline if_lanes<V, uint8_t, int8_t, uint16_t, int16_t> vshuffo(V u, V v) {
+  typedef typename lane_traits<wide_lane<typename V::lane_t>>::unsigned_t W;
+  return map_chunks<W, V>([](chunk<W> a, chunk<W> b) { return pack_even_odd<W>(odd_lanes<W>(b), odd_lanes<W>(a)); }, u,
+                          v);
+}
+
+// vshuff: r[2i] = u[i], r[2i+1] = u[i + L/2]; 8- and 16-bit lanes.  HVX: vshuff(Vu)
+template <class V> inline if_lanes<V, uint8_t, int8_t, uint16_t, int16_t> vshuff(V u) {
+  constexpr size_t half_lanes = V::lanes / 2;
+  V r;
+  for (size_t i = 0; i < half_lanes; ++i) {
+    r.value[2 * i] = u.value[i];
+    r.value[2 * i + 1] = u.value[i + half_lanes];
+  }
+  return r;
+}
+
+// vdeal: r[i] = u[2i], r[i + L/2] = u[2i+1], the inverse of vshuff; 8- and 16-bit lanes.  HVX: vdeal(Vu)
+template <class V> inline if_lanes<V, uint8_t, int8_t, uint16_t, int16_t> vdeal(V u) {
+  constexpr size_t half_lanes = V::lanes / 2;
+  V r;
+  for (size_t i = 0; i < half_lanes; ++i) {
+    r.value[i] = u.value[2 * i];
+    r.value[i + half_lanes] = u.value[2 * i + 1];
+  }
+  return r;
+}
+
+namespace impl {
+// One stage of the two-vector network: hi[k] <-> lo[k + o] for every k with (k & o) == 0.
+inline void swap_stage(uint8_t* lo, uint8_t* hi, size_t n, size_t o) {
+  for (size_t k = 0; k < n; ++k) {
+    if (k & o) continue;
+    const uint8_t t = hi[k];
+    hi[k] = lo[k + o];
+    lo[k + o] = t;
+  }
+}
+template <class V> inline wide_of<V> shuffle_network(V u, V v, int rt, bool rising) {
+  constexpr size_t n = sizeof(V);
+  alignas(16) uint8_t lo[n], hi[n];
+  __builtin_memcpy(lo, &v, n);
+  __builtin_memcpy(hi, &u, n);
+  for (size_t step = 1; step < n; step <<= 1) {
+    const size_t o = rising ? step : n / 2 / step;
+    if (static_cast<uint32_t>(rt) & o) swap_stage(lo, hi, n, o);
+  }
+  wide_of<V> r;
+  __builtin_memcpy(reinterpret_cast<char*>(&r), lo, n);
+  __builtin_memcpy(reinterpret_cast<char*>(&r) + n, hi, n);
+  return r;
+}
+}  // namespace impl
+
+// vshuff: with lo = v, hi = u, for each set bit b of rt, rising: swap hi[k] with
+// lo[k + 2^b] for every byte k with bit b clear.  HVX: vshuff(Vy,Vx,Rt)
+template <class V> inline wide_of<if_plain<V>> vshuff(V u, V v, int rt) {
+  return impl::shuffle_network(u, v, rt, true);
+}
+
+// vdeal: the same network with the bits of rt falling; undoes vshuff.  HVX: vdeal(Vy,Vx,Rt)
+template <class V> inline wide_of<if_plain<V>> vdeal(V u, V v, int rt) {
+  return impl::shuffle_network(u, v, rt, false);
+}
+
+// interleave: pair lane 2i = even[i], 2i+1 = odd[i], in lane order.  HVX: vshuff(Vy,Vx,-lane bytes)
+template <class T> inline wide_of<T> interleave(T odd, T even) { return vshuff(odd, even, -lane_bytes<T>()); }
+
+// deinterleave: the inverse of interleave.  HVX: vdeal(Vy,Vx,-lane bytes)
+template <class T> inline wide_of<T> deinterleave(T odd, T even) { return vdeal(odd, even, -lane_bytes<T>()); }
+
+namespace impl {
+template <class V> inline V delta_network(V u, V c, bool rising) {
+  constexpr size_t n = sizeof(V);
+  alignas(16) uint8_t in[n], ctl[n], out[n];
+  __builtin_memcpy(in, &u, n);
+  __builtin_memcpy(ctl, &c, n);
+  for (size_t step = 1; step < n; step <<= 1) {
+    const size_t o = rising ? step : n / 2 / step;
+    for (size_t k = 0; k < n; ++k) out[k] = (ctl[k] & o) ? in[k ^ o] : in[k];
+    __builtin_memcpy(in, out, n);
+  }
+  V r;
+  __builtin_memcpy(&r, in, n);
+  return r;
+}
+}  // namespace impl
+
+// vdelta: for o = N/2 down to 1: r[k] = (v[k] & o) ? in[k ^ o] : in[k], in = u at the
+// start and r of the stage before after it, bytes.  HVX: vdelta(Vu,Vv)
+template <class V> inline if_plain<V> vdelta(V u, V v) { return impl::delta_network(u, v, false); }
+
+// vrdelta: the same network with o rising from 1 to N/2.  HVX: vrdelta(Vu,Vv)
+template <class V> inline if_plain<V> vrdelta(V u, V v) { return impl::delta_network(u, v, true); }
+
+}  // namespace portable
+}  // namespace hvx
+
+#endif
