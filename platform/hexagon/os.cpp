@@ -207,6 +207,9 @@ const char* env(const char* name) {
 
 void write_log(const char* text, size_t length) { rt::write_all(2, text, length); }
 
+// The thread lives as long as the process: it is never joined, its stack never unmapped.
+bool start_thread(void (*fn)(void*), void* arg) { return rt::thread_start(fn, arg) != nullptr; }
+
 uint64_t now_us() {
   struct {
     int32_t sec;

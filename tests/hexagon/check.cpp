@@ -34,10 +34,11 @@ const char* only_option(int argc, char** argv) {
   return nullptr;
 }
 
-int run_all(const char* prefix) {
+int run_all(const char* only, const char* except) {
   int passed = 0, failures = 0;
   for (test* t = first; t != nullptr; t = t->next) {
-    if (prefix != nullptr && !starts_with(t->name, prefix)) continue;
+    if (only != nullptr && !starts_with(t->name, only)) continue;
+    if (except != nullptr && starts_with(t->name, except)) continue;
     out::print("[ RUN      ] %s\n", t->name);
     failed = false;
     t->body();

@@ -19,9 +19,10 @@ struct registrar {
   explicit registrar(test* t);
 };
 
-// Runs the cases whose name starts with `prefix` (all for null) and prints the summary:
-// "N passed, N failed". Non-zero if any case failed or none ran.
-int run_all(const char* prefix);
+// Runs the cases whose name starts with `only` (all for null) and not with `except`
+// (none for null), and prints the summary "N passed, N failed". Non-zero if any case
+// failed or none ran.
+int run_all(const char* only, const char* except = nullptr);
 // The value of --only=PREFIX among the arguments, or null.
 const char* only_option(int argc, char** argv);
 
