@@ -108,8 +108,10 @@ template <class S> typename S::qvec make_pred(const std::vector<bool>& on) {
 }
 template <class S> std::vector<bool> rand_flags(std::mt19937& g, int lane_bytes = 1) {
   std::vector<bool> on(S::n);
-  for (size_t i = 0; i < S::n; i += lane_bytes)
-    for (int j = 0; j < lane_bytes; ++j) on[i + j] = (g() & 1) != 0;
+  for (size_t i = 0; i < S::n; i += lane_bytes) {
+    const bool lane_on = (g() & 1) != 0;
+    for (int j = 0; j < lane_bytes; ++j) on[i + j] = lane_on;
+  }
   return on;
 }
 template <class Q> std::vector<bool> flags(const Q& q) {
