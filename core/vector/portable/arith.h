@@ -11,6 +11,11 @@ CORVANE_PORTABLE_INLINE namespace portable {
 
 namespace impl {
 template <class L> inline chunk<L> add_sat(chunk<L> x, chunk<L> y) {
+#if CORVANE_GCC_SSE2
+  if constexpr (nstd::is_same_c<L, uint8_t>::value) return (chunk<L>)__builtin_ia32_paddusb128((sse_bytes)x, (sse_bytes)y);
+  if constexpr (nstd::is_same_c<L, uint16_t>::value) return (chunk<L>)__builtin_ia32_paddusw128((sse_halves)x, (sse_halves)y);
+  if constexpr (nstd::is_same_c<L, int16_t>::value) return (chunk<L>)__builtin_ia32_paddsw128((sse_halves)x, (sse_halves)y);
+#endif
   if constexpr (lane_traits<L>::is_signed) {
     // Overflow where both operands differ in sign from the wrapped sum; the limit then
     // takes the sign of x.
@@ -24,6 +29,11 @@ template <class L> inline chunk<L> add_sat(chunk<L> x, chunk<L> y) {
   }
 }
 template <class L> inline chunk<L> sub_sat(chunk<L> x, chunk<L> y) {
+#if CORVANE_GCC_SSE2
+  if constexpr (nstd::is_same_c<L, uint8_t>::value) return (chunk<L>)__builtin_ia32_psubusb128((sse_bytes)x, (sse_bytes)y);
+  if constexpr (nstd::is_same_c<L, uint16_t>::value) return (chunk<L>)__builtin_ia32_psubusw128((sse_halves)x, (sse_halves)y);
+  if constexpr (nstd::is_same_c<L, int16_t>::value) return (chunk<L>)__builtin_ia32_psubsw128((sse_halves)x, (sse_halves)y);
+#endif
   if constexpr (lane_traits<L>::is_signed) {
     constexpr int top = lane_traits<L>::bits - 1;
     const chunk<L> s = sub_wrap<L>(x, y);
@@ -39,37 +49,37 @@ template <class L> inline chunk<L> sub_sat(chunk<L> x, chunk<L> y) {
 // vadd: r[i] = u[i] + v[i], wrapping.  HVX: vadd(Vu,Vv)
 template <class V> inline nstd::on_if_t<is_int_lane<V>, if_plain<V>> vadd(V u, V v) {
   typedef typename V::lane_t L;
-  return map_chunks<L, V>(add_wrap<L>, u, v);
+  return map_chunks<L, V>([](chunk<L> x, chunk<L> y) { return add_wrap<L>(x, y); }, u, v);
 }
 
 // vsub: r[i] = u[i] - v[i], wrapping.  HVX: vsub(Vu,Vv)
 template <class V> inline nstd::on_if_t<is_int_lane<V>, if_plain<V>> vsub(V u, V v) {
   typedef typename V::lane_t L;
-  return map_chunks<L, V>(sub_wrap<L>, u, v);
+  return map_chunks<L, V>([](chunk<L> x, chunk<L> y) { return sub_wrap<L>(x, y); }, u, v);
 }
 
 // vadd_sat: r[i] = sat(u[i] + v[i]); u8, u16, i16, i32 lanes.  HVX: vadd(Vu,Vv):sat
 template <class V> inline if_lanes<V, uint8_t, uint16_t, int16_t, int32_t> vadd_sat(V u, V v) {
   typedef typename V::lane_t L;
-  return map_chunks<L, V>(impl::add_sat<L>, u, v);
+  return map_chunks<L, V>([](chunk<L> x, chunk<L> y) { return impl::add_sat<L>(x, y); }, u, v);
 }
 
 // vsub_sat: r[i] = sat(u[i] - v[i]); u8, u16, i16, i32 lanes.  HVX: vsub(Vu,Vv):sat
 template <class V> inline if_lanes<V, uint8_t, uint16_t, int16_t, int32_t> vsub_sat(V u, V v) {
   typedef typename V::lane_t L;
-  return map_chunks<L, V>(impl::sub_sat<L>, u, v);
+  return map_chunks<L, V>([](chunk<L> x, chunk<L> y) { return impl::sub_sat<L>(x, y); }, u, v);
 }
 
 // vadd_w on pairs: r.lo = vadd(uu.lo, vv.lo), r.hi = vadd(uu.hi, vv.hi).  HVX: vadd(Vuu,Vvv)
 template <class W> inline nstd::on_if_t<W::vectors == 2 && is_int_lane<W>, W> vadd_w(W uu, W vv) {
   typedef typename W::lane_t L;
-  return map_chunks<L, W>(add_wrap<L>, uu, vv);
+  return map_chunks<L, W>([](chunk<L> x, chunk<L> y) { return add_wrap<L>(x, y); }, uu, vv);
 }
 
 // vsub_w on pairs: r.lo = vsub(uu.lo, vv.lo), r.hi = vsub(uu.hi, vv.hi).  HVX: vsub(Vuu,Vvv)
 template <class W> inline nstd::on_if_t<W::vectors == 2 && is_int_lane<W>, W> vsub_w(W uu, W vv) {
   typedef typename W::lane_t L;
-  return map_chunks<L, W>(sub_wrap<L>, uu, vv);
+  return map_chunks<L, W>([](chunk<L> x, chunk<L> y) { return sub_wrap<L>(x, y); }, uu, vv);
 }
 
 // vadd_w widening: lo[i] = u[2i] + v[2i], hi[i] = u[2i+1] + v[2i+1], exact; u8 to i16,
@@ -97,7 +107,7 @@ template <mode_enum M, bool Neg, class V>
 inline if_lanes<V, uint32_t, int32_t> condacc(gen_pred_vec<M, Neg> q, V x, V u) {
   static_assert(M == V::mode, "predicate of another mode");
   typedef typename V::lane_t L;
-  const V sum = map_chunks<L, V>(add_wrap<L>, x, u);
+  const V sum = map_chunks<L, V>([](chunk<L> x, chunk<L> y) { return add_wrap<L>(x, y); }, x, u);
   return map_chunks<uint8_t, V>(
       [](chunk<uint8_t> m, chunk<uint8_t> a, chunk<uint8_t> b) { return Neg ? (b & m) | (a & ~m) : (a & m) | (b & ~m); },
       q.value, sum, x);
@@ -117,13 +127,13 @@ template <class V> inline if_lanes<V, int16_t, int32_t> vabs(V u) {
 // vmax: r[i] = max(u[i], v[i]); u8, u16, i16, i32 lanes.  HVX: vmax(Vu,Vv)
 template <class V> inline if_lanes<V, uint8_t, uint16_t, int16_t, int32_t> vmax(V u, V v) {
   typedef typename V::lane_t L;
-  return map_chunks<L, V>(max_lanes<L>, u, v);
+  return map_chunks<L, V>([](chunk<L> x, chunk<L> y) { return max_lanes<L>(x, y); }, u, v);
 }
 
 // vmin: r[i] = min(u[i], v[i]); u8, u16, i16, i32 lanes.  HVX: vmin(Vu,Vv)
 template <class V> inline if_lanes<V, uint8_t, uint16_t, int16_t, int32_t> vmin(V u, V v) {
   typedef typename V::lane_t L;
-  return map_chunks<L, V>(min_lanes<L>, u, v);
+  return map_chunks<L, V>([](chunk<L> x, chunk<L> y) { return min_lanes<L>(x, y); }, u, v);
 }
 
 }  // namespace portable

@@ -22,8 +22,22 @@
 #define CORVANE_PORTABLE_INLINE inline
 #endif
 
+// GCC does not turn the saturating formulas into the SSE2 instructions that compute
+// exactly them (paddusb and kin); its builtins name them without a header. Clang finds
+// the instructions from the formulas itself.
+#if defined(__SSE2__) && defined(__GNUC__) && !defined(__clang__)
+#define CORVANE_GCC_SSE2 1
+#else
+#define CORVANE_GCC_SSE2 0
+#endif
+
 namespace hvx {
 namespace portable_lanes {
+
+#if CORVANE_GCC_SSE2
+typedef char sse_bytes __attribute__((vector_size(16)));
+typedef short sse_halves __attribute__((vector_size(16)));
+#endif
 
 constexpr size_t chunk_bytes = 16;
 template <class L> using chunk = raw_lanes<L, chunk_bytes>;

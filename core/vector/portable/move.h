@@ -82,13 +82,13 @@ template <class V> inline widened<if_lanes<V, uint8_t, int8_t, uint16_t, int16_t
 // vzxt: lo[i] = u[2i], hi[i] = u[2i+1], zero extended; u8 and u16 lanes.  HVX: vzxt(Vu)
 template <class V> inline widened<if_lanes<V, uint8_t, uint16_t>> vzxt(V u) {
   typedef wide_lane<typename V::lane_t> W;
-  return map_even_odd<W, widened<V>>(even_lanes<W>, odd_lanes<W>, u);
+  return map_even_odd<W, widened<V>>([](chunk<W> x) { return even_lanes<W>(x); }, [](chunk<W> x) { return odd_lanes<W>(x); }, u);
 }
 
 // vsxt: lo[i] = u[2i], hi[i] = u[2i+1], sign extended; i8 and i16 lanes.  HVX: vsxt(Vu)
 template <class V> inline widened<if_lanes<V, int8_t, int16_t>> vsxt(V u) {
   typedef wide_lane<typename V::lane_t> W;
-  return map_even_odd<W, widened<V>>(even_lanes<W>, odd_lanes<W>, u);
+  return map_even_odd<W, widened<V>>([](chunk<W> x) { return even_lanes<W>(x); }, [](chunk<W> x) { return odd_lanes<W>(x); }, u);
 }
 
 // vpacke: the low half of each lane; r[i] = v[i] for i < L, r[i] = u[i - L] above.  HVX: vpacke(Vu,Vv)
