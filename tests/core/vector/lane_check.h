@@ -49,6 +49,15 @@ template <class F> void each_size(F f) {
   run(sized<128>{});
 }
 
+// A test case run in both vector sizes: the body sees S (sized<64> or sized<128>) and
+// the generator g, and runs kRounds times per size.
+#define LANE_TEST(suite, form)                                                                       \
+  template <class S> void suite##_##form(std::mt19937& g);                                          \
+  TEST(suite, form) {                                                                                \
+    ::lane_check::each_size([](auto s, std::mt19937& g) { suite##_##form<decltype(s)>(g); });        \
+  }                                                                                                  \
+  template <class S> void suite##_##form([[maybe_unused]] std::mt19937& g)
+
 // A lane value: one in eight is each of min, max, 0 and -1 (1 if unsigned), the rest uniform.
 template <class L> L rand_lane(std::mt19937& g) {
   typedef std::numeric_limits<L> lim;

@@ -13,114 +13,92 @@ int rand_shift(std::mt19937& g) {
   return g() % 3 ? static_cast<int>(g()) : picks[g() % 11];
 }
 
-TEST(VectorMove, vzero) {
-  each_size([](auto s, std::mt19937&) {
-    typedef decltype(s) S;
-    expect_lanes(hvx::vzero<typename S::template v<int32_t>>(), std::vector<int32_t>(S::n / 4, 0));
-    expect_lanes(hvx::vzero<typename S::vec>(), std::vector<uint8_t>(S::n, 0));
-  });
+LANE_TEST(VectorMove, vzero) {
+  expect_lanes(hvx::vzero<typename S::template v<int32_t>>(), std::vector<int32_t>(S::n / 4, 0));
+  expect_lanes(hvx::vzero<typename S::vec>(), std::vector<uint8_t>(S::n, 0));
 }
 
-TEST(VectorMove, vsplat) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef decltype(s) S;
-    const uint32_t w = g();
-    expect_lanes(hvx::vsplat<typename S::vec>(static_cast<int32_t>(w)), std::vector<uint32_t>(S::n / 4, w));
-    expect_lanes(hvx::vsplat<typename S::template v<int16_t>>(static_cast<int16_t>(w)),
-                 std::vector<int16_t>(S::n / 2, static_cast<int16_t>(w)));
-    expect_lanes(hvx::vsplat<typename S::template v<uint8_t>>(static_cast<uint8_t>(w)),
-                 std::vector<uint8_t>(S::n, static_cast<uint8_t>(w)));
-  });
+LANE_TEST(VectorMove, vsplat) {
+  const uint32_t w = g();
+  expect_lanes(hvx::vsplat<typename S::vec>(static_cast<int32_t>(w)), std::vector<uint32_t>(S::n / 4, w));
+  expect_lanes(hvx::vsplat<typename S::template v<int16_t>>(static_cast<int16_t>(w)),
+               std::vector<int16_t>(S::n / 2, static_cast<int16_t>(w)));
+  expect_lanes(hvx::vsplat<typename S::template v<uint8_t>>(static_cast<uint8_t>(w)),
+               std::vector<uint8_t>(S::n, static_cast<uint8_t>(w)));
 }
 
-TEST(VectorMove, valign) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef typename decltype(s)::template v<uint8_t> V;
-    const V u = rand_vec<V>(g), v = rand_vec<V>(g);
-    const int rt = rand_shift(g);
-    const auto a = lanes<uint8_t>(u), b = lanes<uint8_t>(v);
-    const size_t n = V::lanes, sh = mod(rt, n);
-    std::vector<uint8_t> want(n);
-    for (size_t i = 0; i < n; ++i) want[i] = i + sh < n ? b[i + sh] : a[i + sh - n];
-    expect_lanes(hvx::valign(u, v, rt), want);
-  });
+LANE_TEST(VectorMove, valign) {
+  typedef typename S::template v<uint8_t> V;
+  const V u = rand_vec<V>(g), v = rand_vec<V>(g);
+  const int rt = rand_shift(g);
+  const auto a = lanes<uint8_t>(u), b = lanes<uint8_t>(v);
+  const size_t n = V::lanes, sh = mod(rt, n);
+  std::vector<uint8_t> want(n);
+  for (size_t i = 0; i < n; ++i) want[i] = i + sh < n ? b[i + sh] : a[i + sh - n];
+  expect_lanes(hvx::valign(u, v, rt), want);
 }
 
-TEST(VectorMove, vlalign) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef typename decltype(s)::template v<uint8_t> V;
-    const V u = rand_vec<V>(g), v = rand_vec<V>(g);
-    const int rt = rand_shift(g);
-    const auto a = lanes<uint8_t>(u), b = lanes<uint8_t>(v);
-    const size_t n = V::lanes, sh = n - mod(rt, n);
-    std::vector<uint8_t> want(n);
-    for (size_t i = 0; i < n; ++i) want[i] = i + sh < n ? b[i + sh] : a[i + sh - n];
-    expect_lanes(hvx::vlalign(u, v, rt), want);
-  });
+LANE_TEST(VectorMove, vlalign) {
+  typedef typename S::template v<uint8_t> V;
+  const V u = rand_vec<V>(g), v = rand_vec<V>(g);
+  const int rt = rand_shift(g);
+  const auto a = lanes<uint8_t>(u), b = lanes<uint8_t>(v);
+  const size_t n = V::lanes, sh = n - mod(rt, n);
+  std::vector<uint8_t> want(n);
+  for (size_t i = 0; i < n; ++i) want[i] = i + sh < n ? b[i + sh] : a[i + sh - n];
+  expect_lanes(hvx::vlalign(u, v, rt), want);
 }
 
-TEST(VectorMove, vror) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef typename decltype(s)::template v<uint8_t> V;
-    const V u = rand_vec<V>(g);
-    const int rt = rand_shift(g);
-    const auto a = lanes<uint8_t>(u);
-    std::vector<uint8_t> want(V::lanes);
-    for (size_t i = 0; i < V::lanes; ++i) want[i] = a[mod(static_cast<int64_t>(i) + rt, V::lanes)];
-    expect_lanes(hvx::vror(u, rt), want);
-  });
+LANE_TEST(VectorMove, vror) {
+  typedef typename S::template v<uint8_t> V;
+  const V u = rand_vec<V>(g);
+  const int rt = rand_shift(g);
+  const auto a = lanes<uint8_t>(u);
+  std::vector<uint8_t> want(V::lanes);
+  for (size_t i = 0; i < V::lanes; ++i) want[i] = a[mod(static_cast<int64_t>(i) + rt, V::lanes)];
+  expect_lanes(hvx::vror(u, rt), want);
 }
 
-TEST(VectorMove, vmux) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef decltype(s) S;
-    typedef typename S::template v<uint8_t> V;
-    const V u = rand_vec<V>(g), v = rand_vec<V>(g);
-    const auto on = rand_flags<S>(g);
-    const auto q = make_pred<S>(on);
-    const auto a = lanes<uint8_t>(u), b = lanes<uint8_t>(v);
-    std::vector<uint8_t> want(S::n), want_negated(S::n);
-    for (size_t i = 0; i < S::n; ++i) {
-      want[i] = on[i] ? a[i] : b[i];
-      want_negated[i] = on[i] ? b[i] : a[i];
-    }
-    expect_lanes(hvx::vmux(q, u, v), want);
-    expect_lanes(hvx::vmux(!q, u, v), want_negated);
-  });
+LANE_TEST(VectorMove, vmux) {
+  typedef typename S::template v<uint8_t> V;
+  const V u = rand_vec<V>(g), v = rand_vec<V>(g);
+  const auto on = rand_flags<S>(g);
+  const auto q = make_pred<S>(on);
+  const auto a = lanes<uint8_t>(u), b = lanes<uint8_t>(v);
+  std::vector<uint8_t> want(S::n), want_negated(S::n);
+  for (size_t i = 0; i < S::n; ++i) {
+    want[i] = on[i] ? a[i] : b[i];
+    want_negated[i] = on[i] ? b[i] : a[i];
+  }
+  expect_lanes(hvx::vmux(q, u, v), want);
+  expect_lanes(hvx::vmux(!q, u, v), want_negated);
 }
 
-TEST(VectorMove, vcombine) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef decltype(s) S;
-    typedef typename S::template v<int16_t> V;
-    const V u = rand_vec<V>(g), v = rand_vec<V>(g);
-    auto want = lanes<int16_t>(v);
-    const auto a = lanes<int16_t>(u);
-    want.insert(want.end(), a.begin(), a.end());
-    expect_lanes(hvx::vcombine(u, v), want);
-    expect_lanes(hvx::vcombine(typename S::vec(u), typename S::vec(v)), want);
-    const typename S::wvec w{typename S::vec(u), typename S::vec(v)};  // (hi, lo)
-    expect_lanes(w, want);
-    expect_lanes(hvx::unpack(w).first, a);
-  });
+LANE_TEST(VectorMove, vcombine) {
+  typedef typename S::template v<int16_t> V;
+  const V u = rand_vec<V>(g), v = rand_vec<V>(g);
+  auto want = lanes<int16_t>(v);
+  const auto a = lanes<int16_t>(u);
+  want.insert(want.end(), a.begin(), a.end());
+  expect_lanes(hvx::vcombine(u, v), want);
+  expect_lanes(hvx::vcombine(typename S::vec(u), typename S::vec(v)), want);
+  const typename S::wvec w{typename S::vec(u), typename S::vec(v)};  // (hi, lo)
+  expect_lanes(w, want);
+  expect_lanes(hvx::unpack(w).first, a);
 }
 
-TEST(VectorMove, hi) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef typename decltype(s)::template w<int32_t> W;
-    const W w = rand_vec<W>(g);
-    const auto l = lanes<int32_t>(w);
-    expect_lanes(hvx::hi(w), std::vector<int32_t>(l.begin() + l.size() / 2, l.end()));
-  });
+LANE_TEST(VectorMove, hi) {
+  typedef typename S::template w<int32_t> W;
+  const W w = rand_vec<W>(g);
+  const auto l = lanes<int32_t>(w);
+  expect_lanes(hvx::hi(w), std::vector<int32_t>(l.begin() + l.size() / 2, l.end()));
 }
 
-TEST(VectorMove, lo) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef typename decltype(s)::template w<uint8_t> W;
-    const W w = rand_vec<W>(g);
-    const auto l = lanes<uint8_t>(w);
-    expect_lanes(hvx::lo(w), std::vector<uint8_t>(l.begin(), l.begin() + l.size() / 2));
-  });
+LANE_TEST(VectorMove, lo) {
+  typedef typename S::template w<uint8_t> W;
+  const W w = rand_vec<W>(g);
+  const auto l = lanes<uint8_t>(w);
+  expect_lanes(hvx::lo(w), std::vector<uint8_t>(l.begin(), l.begin() + l.size() / 2));
 }
 
 // Widening in lane order (vunpack) or even/odd (vzxt, vsxt) from lane type L to W.
@@ -134,31 +112,24 @@ template <class L, class W, class S, class Op> void check_widen(std::mt19937& g,
   expect_lanes(op(u), want);
 }
 
-TEST(VectorMove, vunpack) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef decltype(s) S;
-    auto op = [](auto u) { return hvx::vunpack(u); };
-    check_widen<uint8_t, uint16_t, S>(g, false, op);
-    check_widen<int8_t, int16_t, S>(g, false, op);
-    check_widen<uint16_t, uint32_t, S>(g, false, op);
-    check_widen<int16_t, int32_t, S>(g, false, op);
-  });
+LANE_TEST(VectorMove, vunpack) {
+  auto op = [](auto u) { return hvx::vunpack(u); };
+  check_widen<uint8_t, uint16_t, S>(g, false, op);
+  check_widen<int8_t, int16_t, S>(g, false, op);
+  check_widen<uint16_t, uint32_t, S>(g, false, op);
+  check_widen<int16_t, int32_t, S>(g, false, op);
 }
 
-TEST(VectorMove, vzxt) {
-  each_size([](auto s, std::mt19937& g) {
-    auto op = [](auto u) { return hvx::vzxt(u); };
-    check_widen<uint8_t, uint16_t, decltype(s)>(g, true, op);
-    check_widen<uint16_t, uint32_t, decltype(s)>(g, true, op);
-  });
+LANE_TEST(VectorMove, vzxt) {
+  auto op = [](auto u) { return hvx::vzxt(u); };
+  check_widen<uint8_t, uint16_t, S>(g, true, op);
+  check_widen<uint16_t, uint32_t, S>(g, true, op);
 }
 
-TEST(VectorMove, vsxt) {
-  each_size([](auto s, std::mt19937& g) {
-    auto op = [](auto u) { return hvx::vsxt(u); };
-    check_widen<int8_t, int16_t, decltype(s)>(g, true, op);
-    check_widen<int16_t, int32_t, decltype(s)>(g, true, op);
-  });
+LANE_TEST(VectorMove, vsxt) {
+  auto op = [](auto u) { return hvx::vsxt(u); };
+  check_widen<int8_t, int16_t, S>(g, true, op);
+  check_widen<int16_t, int32_t, S>(g, true, op);
 }
 
 // Narrowing of two vectors of L to one of T: concatenated (v first) or interleaved
@@ -181,55 +152,43 @@ template <class L, class T, class S, class Op, class F> void check_narrow(std::m
   expect_lanes(op(u, v), want);
 }
 
-TEST(VectorMove, vpacke) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef decltype(s) S;
-    auto op = [](auto u, auto v) { return hvx::vpacke(u, v); };
-    check_narrow<int16_t, int8_t, S>(g, false, op, [](int16_t x) { return static_cast<int8_t>(x); });
-    check_narrow<uint16_t, uint8_t, S>(g, false, op, [](uint16_t x) { return static_cast<uint8_t>(x); });
-    check_narrow<int32_t, int16_t, S>(g, false, op, [](int32_t x) { return static_cast<int16_t>(x); });
-  });
+LANE_TEST(VectorMove, vpacke) {
+  auto op = [](auto u, auto v) { return hvx::vpacke(u, v); };
+  check_narrow<int16_t, int8_t, S>(g, false, op, [](int16_t x) { return static_cast<int8_t>(x); });
+  check_narrow<uint16_t, uint8_t, S>(g, false, op, [](uint16_t x) { return static_cast<uint8_t>(x); });
+  check_narrow<int32_t, int16_t, S>(g, false, op, [](int32_t x) { return static_cast<int16_t>(x); });
 }
 
-TEST(VectorMove, vpack_usat) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef decltype(s) S;
-    auto op = [](auto u, auto v) { return hvx::vpack_usat(u, v); };
-    check_narrow<int16_t, uint8_t, S>(g, false, op, sat<uint8_t>);
-    check_narrow<int32_t, uint16_t, S>(g, false, op, sat<uint16_t>);
-  });
+LANE_TEST(VectorMove, vpack_usat) {
+  auto op = [](auto u, auto v) { return hvx::vpack_usat(u, v); };
+  check_narrow<int16_t, uint8_t, S>(g, false, op, sat<uint8_t>);
+  check_narrow<int32_t, uint16_t, S>(g, false, op, sat<uint16_t>);
 }
 
-TEST(VectorMove, vpack_isat) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef decltype(s) S;
-    auto op = [](auto u, auto v) { return hvx::vpack_isat(u, v); };
-    check_narrow<int16_t, int8_t, S>(g, false, op, sat<int8_t>);
-    check_narrow<int32_t, int16_t, S>(g, false, op, sat<int16_t>);
-  });
+LANE_TEST(VectorMove, vpack_isat) {
+  auto op = [](auto u, auto v) { return hvx::vpack_isat(u, v); };
+  check_narrow<int16_t, int8_t, S>(g, false, op, sat<int8_t>);
+  check_narrow<int32_t, int16_t, S>(g, false, op, sat<int16_t>);
 }
 
-TEST(VectorMove, vsat) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef decltype(s) S;
-    auto op = [](auto u, auto v) { return hvx::vsat(u, v); };
-    check_narrow<int16_t, uint8_t, S>(g, true, op, sat<uint8_t>);
-    check_narrow<int32_t, int16_t, S>(g, true, op, sat<int16_t>);
-    check_narrow<uint32_t, uint16_t, S>(g, true, op, [](uint32_t x) { return sat<uint16_t>(x); });
+LANE_TEST(VectorMove, vsat) {
+  auto op = [](auto u, auto v) { return hvx::vsat(u, v); };
+  check_narrow<int16_t, uint8_t, S>(g, true, op, sat<uint8_t>);
+  check_narrow<int32_t, int16_t, S>(g, true, op, sat<int16_t>);
+  check_narrow<uint32_t, uint16_t, S>(g, true, op, [](uint32_t x) { return sat<uint16_t>(x); });
 
-    // vsat of an even/odd widening gives the bytes back in their order; a concatenating
-    // pack of the same halves does not.
-    typedef typename S::template v<uint8_t> V8;
-    const V8 a = rand_vec<V8>(g);
-    const auto w = hvx::vzxt(a);
-    typedef typename S::template v<int16_t> V16;
-    expect_lanes(hvx::vsat(hvx::vcast<V16>(hvx::hi(w)), hvx::vcast<V16>(hvx::lo(w))), lanes<uint8_t>(a));
-    const auto packed = lanes<uint8_t>(hvx::vpack_usat(hvx::vcast<V16>(hvx::hi(w)), hvx::vcast<V16>(hvx::lo(w))));
-    const auto even_first = lanes<uint8_t>(a);
-    bool all_even_lanes_first = true;
-    for (size_t i = 0; i < S::n / 2; ++i) all_even_lanes_first &= packed[i] == even_first[2 * i];
-    EXPECT_TRUE(all_even_lanes_first) << "vpack keeps the even lanes first";
-  });
+  // vsat of an even/odd widening gives the bytes back in their order; a concatenating
+  // pack of the same halves does not.
+  typedef typename S::template v<uint8_t> V8;
+  const V8 a = rand_vec<V8>(g);
+  const auto w = hvx::vzxt(a);
+  typedef typename S::template v<int16_t> V16;
+  expect_lanes(hvx::vsat(hvx::vcast<V16>(hvx::hi(w)), hvx::vcast<V16>(hvx::lo(w))), lanes<uint8_t>(a));
+  const auto packed = lanes<uint8_t>(hvx::vpack_usat(hvx::vcast<V16>(hvx::hi(w)), hvx::vcast<V16>(hvx::lo(w))));
+  const auto even_first = lanes<uint8_t>(a);
+  bool all_even_lanes_first = true;
+  for (size_t i = 0; i < S::n / 2; ++i) all_even_lanes_first &= packed[i] == even_first[2 * i];
+  EXPECT_TRUE(all_even_lanes_first) << "vpack keeps the even lanes first";
 }
 
 // vshuffe / vshuffo: result lane 2i from v, 2i + 1 from u, both taking lane 2i + odd.
@@ -245,20 +204,16 @@ template <class L, class S, class Op> void check_shuffe(std::mt19937& g, int odd
   expect_lanes(op(u, v), want);
 }
 
-TEST(VectorPermute, vshuffe) {
-  each_size([](auto s, std::mt19937& g) {
-    auto op = [](auto u, auto v) { return hvx::vshuffe(u, v); };
-    check_shuffe<uint8_t, decltype(s)>(g, 0, op);
-    check_shuffe<int16_t, decltype(s)>(g, 0, op);
-  });
+LANE_TEST(VectorPermute, vshuffe) {
+  auto op = [](auto u, auto v) { return hvx::vshuffe(u, v); };
+  check_shuffe<uint8_t, S>(g, 0, op);
+  check_shuffe<int16_t, S>(g, 0, op);
 }
 
-TEST(VectorPermute, vshuffo) {
-  each_size([](auto s, std::mt19937& g) {
-    auto op = [](auto u, auto v) { return hvx::vshuffo(u, v); };
-    check_shuffe<int8_t, decltype(s)>(g, 1, op);
-    check_shuffe<uint16_t, decltype(s)>(g, 1, op);
-  });
+LANE_TEST(VectorPermute, vshuffo) {
+  auto op = [](auto u, auto v) { return hvx::vshuffo(u, v); };
+  check_shuffe<int8_t, S>(g, 1, op);
+  check_shuffe<uint16_t, S>(g, 1, op);
 }
 
 template <class L, class S> void check_shuff_deal(std::mt19937& g) {
@@ -277,18 +232,14 @@ template <class L, class S> void check_shuff_deal(std::mt19937& g) {
   expect_lanes(hvx::vdeal(u), dealt);
 }
 
-TEST(VectorPermute, vshuff) {
-  each_size([](auto s, std::mt19937& g) {
-    check_shuff_deal<uint8_t, decltype(s)>(g);
-    check_shuff_deal<int16_t, decltype(s)>(g);
-  });
+LANE_TEST(VectorPermute, vshuff) {
+  check_shuff_deal<uint8_t, S>(g);
+  check_shuff_deal<int16_t, S>(g);
 }
 
-TEST(VectorPermute, vdeal) {
-  each_size([](auto s, std::mt19937& g) {
-    check_shuff_deal<int8_t, decltype(s)>(g);
-    check_shuff_deal<uint16_t, decltype(s)>(g);
-  });
+LANE_TEST(VectorPermute, vdeal) {
+  check_shuff_deal<int8_t, S>(g);
+  check_shuff_deal<uint16_t, S>(g);
 }
 
 // The two-vector network, stage by stage as its definition reads.
@@ -305,25 +256,21 @@ std::vector<uint8_t> network(std::vector<uint8_t> lo, std::vector<uint8_t> hi, u
   return lo;
 }
 
-TEST(VectorPermute, vshuff_pair) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef typename decltype(s)::template v<uint8_t> V;
-    const V u = rand_vec<V>(g), v = rand_vec<V>(g);
-    const uint32_t rt = g();
-    expect_lanes(hvx::vshuff(u, v, static_cast<int>(rt)), network(lanes<uint8_t>(v), lanes<uint8_t>(u), rt, true));
-  });
+LANE_TEST(VectorPermute, vshuff_pair) {
+  typedef typename S::template v<uint8_t> V;
+  const V u = rand_vec<V>(g), v = rand_vec<V>(g);
+  const uint32_t rt = g();
+  expect_lanes(hvx::vshuff(u, v, static_cast<int>(rt)), network(lanes<uint8_t>(v), lanes<uint8_t>(u), rt, true));
 }
 
-TEST(VectorPermute, vdeal_pair) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef typename decltype(s)::template v<uint8_t> V;
-    const V u = rand_vec<V>(g), v = rand_vec<V>(g);
-    const uint32_t rt = g();
-    const auto d = hvx::vdeal(u, v, static_cast<int>(rt));
-    expect_lanes(d, network(lanes<uint8_t>(v), lanes<uint8_t>(u), rt, false));
-    SCOPED_TRACE("vshuff undoes vdeal with the same control");
-    expect_lanes(hvx::vshuff(hvx::hi(d), hvx::lo(d), static_cast<int>(rt)), network(lanes<uint8_t>(v), lanes<uint8_t>(u), 0, true));
-  });
+LANE_TEST(VectorPermute, vdeal_pair) {
+  typedef typename S::template v<uint8_t> V;
+  const V u = rand_vec<V>(g), v = rand_vec<V>(g);
+  const uint32_t rt = g();
+  const auto d = hvx::vdeal(u, v, static_cast<int>(rt));
+  expect_lanes(d, network(lanes<uint8_t>(v), lanes<uint8_t>(u), rt, false));
+  SCOPED_TRACE("vshuff undoes vdeal with the same control");
+  expect_lanes(hvx::vshuff(hvx::hi(d), hvx::lo(d), static_cast<int>(rt)), network(lanes<uint8_t>(v), lanes<uint8_t>(u), 0, true));
 }
 
 template <class L, class S> void check_interleave(std::mt19937& g) {
@@ -342,26 +289,22 @@ template <class L, class S> void check_interleave(std::mt19937& g) {
   expect_lanes(hvx::hi(back), o);
 }
 
-TEST(VectorPermute, interleave) {
-  each_size([](auto s, std::mt19937& g) {
-    check_interleave<uint8_t, decltype(s)>(g);
-    check_interleave<int16_t, decltype(s)>(g);
-    check_interleave<uint32_t, decltype(s)>(g);
-  });
+LANE_TEST(VectorPermute, interleave) {
+  check_interleave<uint8_t, S>(g);
+  check_interleave<int16_t, S>(g);
+  check_interleave<uint32_t, S>(g);
 }
 
-TEST(VectorPermute, deinterleave) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef typename decltype(s)::template v<int16_t> V;
-    const V hi = rand_vec<V>(g), lo = rand_vec<V>(g);
-    const auto h = lanes<int16_t>(hi), l = lanes<int16_t>(lo);
-    std::vector<int16_t> all(l);
-    all.insert(all.end(), h.begin(), h.end());
-    std::vector<int16_t> even, odd;
-    for (size_t i = 0; i < all.size(); ++i) (i % 2 ? odd : even).push_back(all[i]);
-    even.insert(even.end(), odd.begin(), odd.end());
-    expect_lanes(hvx::deinterleave(hi, lo), even);
-  });
+LANE_TEST(VectorPermute, deinterleave) {
+  typedef typename S::template v<int16_t> V;
+  const V hi = rand_vec<V>(g), lo = rand_vec<V>(g);
+  const auto h = lanes<int16_t>(hi), l = lanes<int16_t>(lo);
+  std::vector<int16_t> all(l);
+  all.insert(all.end(), h.begin(), h.end());
+  std::vector<int16_t> even, odd;
+  for (size_t i = 0; i < all.size(); ++i) (i % 2 ? odd : even).push_back(all[i]);
+  even.insert(even.end(), odd.begin(), odd.end());
+  expect_lanes(hvx::deinterleave(hi, lo), even);
 }
 
 std::vector<uint8_t> delta(std::vector<uint8_t> in, const std::vector<uint8_t>& ctl, bool rising) {
@@ -377,20 +320,16 @@ std::vector<uint8_t> delta(std::vector<uint8_t> in, const std::vector<uint8_t>& 
   return in;
 }
 
-TEST(VectorPermute, vdelta) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef typename decltype(s)::template v<uint8_t> V;
-    const V u = rand_vec<V>(g), v = rand_vec<V>(g);
-    expect_lanes(hvx::vdelta(u, v), delta(lanes<uint8_t>(u), lanes<uint8_t>(v), false));
-  });
+LANE_TEST(VectorPermute, vdelta) {
+  typedef typename S::template v<uint8_t> V;
+  const V u = rand_vec<V>(g), v = rand_vec<V>(g);
+  expect_lanes(hvx::vdelta(u, v), delta(lanes<uint8_t>(u), lanes<uint8_t>(v), false));
 }
 
-TEST(VectorPermute, vrdelta) {
-  each_size([](auto s, std::mt19937& g) {
-    typedef typename decltype(s)::template v<uint8_t> V;
-    const V u = rand_vec<V>(g), v = rand_vec<V>(g);
-    expect_lanes(hvx::vrdelta(u, v), delta(lanes<uint8_t>(u), lanes<uint8_t>(v), true));
-  });
+LANE_TEST(VectorPermute, vrdelta) {
+  typedef typename S::template v<uint8_t> V;
+  const V u = rand_vec<V>(g), v = rand_vec<V>(g);
+  expect_lanes(hvx::vrdelta(u, v), delta(lanes<uint8_t>(u), lanes<uint8_t>(v), true));
 }
 
 }  // namespace
