@@ -213,6 +213,8 @@ template <mode_enum M> using wvu16_t = make_wvec_t<M, 2, false>;
 template <mode_enum M> using wvi16_t = make_wvec_t<M, 2, true>;
 template <mode_enum M> using wvu32_t = make_wvec_t<M, 4, false>;
 template <mode_enum M> using wvi32_t = make_wvec_t<M, 4, true>;
+template <mode_enum M> using vec_t = gen_vec<M>;
+template <mode_enum M> using wvec_t = gen_wvec<M>;
 template <mode_enum M> using qvec_t = gen_pred_vec<M, false>;
 template <mode_enum M> using qnvec_t = gen_pred_vec<M, true>;
 
@@ -235,6 +237,9 @@ template <mode_enum M, class T, int Vectors> struct ret_vec_c {
 };
 template <mode_enum M, class T> using gen_ret_vec = typename ret_vec_c<M, T, 1>::type;
 template <mode_enum M, class T> using gen_ret_wvec = typename ret_vec_c<M, T, 2>::type;
+// The same with the mode taken from T.
+template <class T> using ret_vec = gen_ret_vec<T::mode, T>;
+template <class T> using ret_wvec = gen_ret_wvec<T::mode, T>;
 
 // ---- shapes ----------------------------------------------------------------------------
 

@@ -7,6 +7,14 @@ using namespace lane_check;
 
 namespace {
 
+// The selectors name the types that kernels spell out, in both modes.
+using namespace hvx;
+static_assert(nstd::is_same_c<vu8_t<DualHVX>, vu8x128>::value && nstd::is_same_c<wvi16_t<SingleHVX>, wvi16x64>::value,
+              "mode-relative names");
+static_assert(nstd::is_same_c<make_wvec_t<DualHVX, 4, false>, wvu32x64>::value, "pair selector");
+static_assert(vlen<SingleHVX, 16>() == 32 && lane_count<wvu8x256>() == 256 && lane_bytes<vi32x16>() == 4, "counts");
+static_assert(nstd::is_same_c<ret_wvec<wvi16x128>, wvi16x128>::value, "result types");
+
 size_t mod(int64_t a, size_t n) { return static_cast<size_t>(((a % static_cast<int64_t>(n)) + n) % n); }
 int rand_shift(std::mt19937& g) {
   const int picks[] = {0, 1, 63, 64, 65, 127, 128, 129, -1, -64, -127};
