@@ -11,7 +11,7 @@
 #include "core/vector/types.h"
 
 #if defined(__HVX__)
-#error "the hvx backend (core/vector/hvx/) is not written yet"
+#include "core/vector/hvx/backend.h"
 #else
 #include "core/vector/portable/move.h"
 #include "core/vector/portable/permute.h"

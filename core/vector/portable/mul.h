@@ -58,7 +58,7 @@ template <class V> inline widened<if_lanes<V, int16_t>> vmpy(V u, vi16x2 rt) {
 template <class W, class V>
 inline nstd::on_if_t<nstd::is_same_c<W, widened_signed<if_lanes<V, uint8_t>>>::value, W> vmpyacc(W xx, V u,
                                                                                                           vi8x4 rt) {
-  return map_chunks<int16_t, W>([](chunk<int16_t> x, chunk<int16_t> y) { return add_wrap<int16_t>(x, y); }, xx, vmpy(u, rt));
+  return map_chunks<int16_t, W>([](chunk<int16_t> x, chunk<int16_t> y) { return add_wrap<int16_t>(x, y); }, xx, portable::vmpy(u, rt));
 }
 
 // vmpyacc: lo[i] = xx.lo[i] + u[2i] * rt.uh[0], hi[i] = xx.hi[i] + u[2i+1] * rt.uh[1],
@@ -156,7 +156,7 @@ template <class W, class P>
 inline nstd::on_if_t<nstd::is_same_c<W, impl::taps_result<if_pair_lanes<P, uint8_t, int16_t>>>::value, W> vmpaacc(
     W xx, P uu, vi8x4 rt) {
   typedef typename W::lane_t S;
-  return map_chunks<S, W>([](chunk<S> x, chunk<S> y) { return add_wrap<S>(x, y); }, xx, vmpa(uu, rt));
+  return map_chunks<S, W>([](chunk<S> x, chunk<S> y) { return add_wrap<S>(x, y); }, xx, portable::vmpa(uu, rt));
 }
 
 // vtmpy: with a = uu.lo[2i], b = uu.lo[2i+1], c = uu.hi[2i], d = uu.hi[2i+1]:

@@ -81,10 +81,10 @@ template <class V> inline wide_of<if_plain<V>> vdeal(V u, V v, int rt) {
 }
 
 // interleave: pair lane 2i = even[i], 2i+1 = odd[i], in lane order.  HVX: vshuff(Vy,Vx,-lane bytes)
-template <class T> inline wide_of<T> interleave(T odd, T even) { return vshuff(odd, even, -lane_bytes<T>()); }
+template <class T> inline wide_of<T> interleave(T odd, T even) { return portable::vshuff(odd, even, -lane_bytes<T>()); }
 
 // deinterleave: the inverse of interleave.  HVX: vdeal(Vy,Vx,-lane bytes)
-template <class T> inline wide_of<T> deinterleave(T odd, T even) { return vdeal(odd, even, -lane_bytes<T>()); }
+template <class T> inline wide_of<T> deinterleave(T odd, T even) { return portable::vdeal(odd, even, -lane_bytes<T>()); }
 
 namespace impl {
 template <class V> inline V delta_network(V u, V c, bool rising) {
