@@ -31,6 +31,8 @@ void notify_state_changed();
 const char* env(const char* name);  // start-up configuration, null if unset
 void write_log(const char* text, size_t length);
 uint64_t now_us();
+// Starts fn(arg) on a new thread that lives as long as the process; false if none.
+bool start_thread(void (*fn)(void*), void* arg);
 
 // ---- shared state, guarded by lock_state() ----
 struct state {

@@ -5,6 +5,8 @@
 #include <cstdio>
 #include <cstdlib>
 #include <mutex>
+#include <system_error>
+#include <thread>
 
 #include "sim.h"
 
@@ -14,13 +16,14 @@ void run_tls_destructors(thread_state* t);
 
 namespace {
 
+// Never destroyed: the worker pool's threads wait on them until the process is gone.
 std::mutex& state_mutex() {
-  static std::mutex m;
-  return m;
+  static std::mutex* m = new std::mutex;
+  return *m;
 }
 std::condition_variable& state_changed() {
-  static std::condition_variable cv;
-  return cv;
+  static std::condition_variable* cv = new std::condition_variable;
+  return *cv;
 }
 // The lock held by the current thread, so that waiting can release it.
 thread_local std::unique_lock<std::mutex> held;
@@ -52,6 +55,15 @@ void write_log(const char* text, size_t length) { std::fwrite(text, 1, length, s
 uint64_t now_us() {
   using namespace std::chrono;
   return static_cast<uint64_t>(duration_cast<microseconds>(steady_clock::now().time_since_epoch()).count());
+}
+
+bool start_thread(void (*fn)(void*), void* arg) {
+  try {
+    std::thread(fn, arg).detach();
+    return true;
+  } catch (const std::system_error&) {
+    return false;
+  }
 }
 
 }  // namespace sim

@@ -45,6 +45,9 @@ typedef struct {
   int unlock_calls;
   int power_requests;
   int last_clock, last_bus, last_latency;  // arguments of the last HAP_power_request
+  int prepare_mt_job_calls;
+  int cleanup_mt_job_calls;
+  int jobs_submitted;
 } corvane_platform_counters;
 CORVANE_EXPORT void corvane_platform_get_counters(corvane_platform_counters* out);
 CORVANE_EXPORT void corvane_platform_clear_counters(void);

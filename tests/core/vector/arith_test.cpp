@@ -236,7 +236,7 @@ LANE_TEST(VectorShift, vhalf2vfloat) {
       std::memcpy(&want[i], &f, 4);
     } else {  // outside the exact range the bit recipe still holds
       const int n = norm_reference(static_cast<int16_t>(a[i]));
-      want[i] = static_cast<uint32_t>(141 - n) << 23 | static_cast<uint32_t>(static_cast<uint16_t>(a[i] << (n + 2))) << 7;
+      want[i] = static_cast<uint32_t>(141 - n) << 23 | static_cast<uint32_t>(static_cast<uint16_t>(uint32_t{a[i]} << (n + 2))) << 7;
     }
   }
   expect_lanes(hvx::vhalf2vfloat(u), want);

@@ -1,0 +1,126 @@
+// The worker pool: threads started on the first submit, living for the process, that run
+// submitted jobs in order; completion tokens; the compute recommendation; and the
+// preparation of multi-threaded vector jobs, which reserves units for the job when the
+// process holds none.
+#include "dspCV.h"
+#include "sim.h"
+
+namespace {
+
+constexpr int kPoolThreads = 4;
+constexpr unsigned kQueueJobs = 64;
+
+struct job_queue {
+  dspCV_worker_job_t jobs[kQueueJobs];
+  unsigned head;  // next job to run
+  unsigned tail;  // next free slot
+  int threads;    // started
+  int phase;      // 0 no threads yet, 1 being started by the first submit, 2 running
+};
+job_queue queue;  // guarded by sim::lock_state
+
+void pool_thread(void*) {
+  for (;;) {
+    dspCV_worker_job_t job;
+    {
+      sim::guard g;
+      while (queue.head == queue.tail) sim::wait_state_changed();
+      job = queue.jobs[queue.head++ % kQueueJobs];
+      sim::notify_state_changed();  // a slot is free
+    }
+    job.fptr(job.dptr);
+  }
+}
+
+}  // namespace
+
+extern "C" {
+
+int dspCV_worker_pool_submit(dspCV_worker_job_t job) {
+  bool start = false;
+  {
+    sim::guard g;
+    if (queue.phase == 0) {
+      queue.phase = 1;
+      start = true;
+    }
+  }
+  if (start) {  // outside the lock: a new thread may need the platform at once
+    int started = 0;
+    for (int i = 0; i < kPoolThreads; ++i) started += sim::start_thread(pool_thread, nullptr) ? 1 : 0;
+    sim::guard g;
+    queue.threads = started;
+    queue.phase = 2;
+    sim::notify_state_changed();
+  }
+  sim::guard g;
+  while (queue.phase != 2) sim::wait_state_changed();
+  if (queue.threads == 0) return -1;
+  while (queue.tail - queue.head == kQueueJobs) sim::wait_state_changed();
+  queue.jobs[queue.tail++ % kQueueJobs] = job;
+  ++sim::the_state().counters.jobs_submitted;
+  sim::notify_state_changed();
+  return 0;
+}
+
+void dspCV_worker_pool_synctoken_init(dspCV_synctoken_t* token, unsigned int jobs) {
+  sim::guard g;
+  token->done = 0;
+  token->jobs = jobs;
+}
+
+void dspCV_worker_pool_synctoken_jobdone(dspCV_synctoken_t* token) {
+  sim::guard g;
+  token->done = token->done + 1;
+  sim::notify_state_changed();
+}
+
+void dspCV_worker_pool_synctoken_wait(dspCV_synctoken_t* token) {
+  sim::guard g;
+  while (token->done < token->jobs) sim::wait_state_changed();
+}
+
+unsigned int dspCV_atomic_inc_return(unsigned int* target) {
+  return __atomic_add_fetch(target, 1u, __ATOMIC_SEQ_CST);
+}
+
+int dspCV_concurrency_query(dspCV_ConcurrencyAttribute* attributes, int count) {
+  sim::guard g;
+  for (int i = 0; i < count; ++i)
+    if (attributes[i].ID == COMPUTE_RECOMMENDATION)
+      attributes[i].value = sim::the_state().compute_not_ok ? COMPUTE_RECOMMENDATION_NOT_OK : COMPUTE_RECOMMENDATION_OK;
+  return 0;
+}
+
+// Units and threads for a job of vector workers: a 128-byte context takes two units.
+int dspCV_hvx_prepare_mt_job(dspCV_hvx_config_t* config) {
+  sim::guard g;
+  sim::state& s = sim::the_state();
+  ++s.counters.prepare_mt_job_calls;
+  config->tempReserve = 0;
+  if (s.reserved == 0 && s.total_units > 0) {
+    s.reserved = s.total_units;
+    config->tempReserve = 1;
+  }
+  const bool wide = config->mode == DSPCV_HVX_MODE_128B || (config->mode == DSPCV_HVX_MODE_DONT_CARE && s.reserved >= 2);
+  const int per_context = wide ? 2 : 1;
+  const int contexts = s.reserved / per_context;
+  config->VLEN = wide ? 128 : 64;
+  config->numUnits = contexts * per_context;
+  config->numThreads = contexts;
+  return contexts > 0 ? 0 : -1;
+}
+
+int dspCV_hvx_cleanup_mt_job(dspCV_hvx_config_t* config) {
+  sim::guard g;
+  sim::state& s = sim::the_state();
+  ++s.counters.cleanup_mt_job_calls;
+  if (config->tempReserve) {
+    config->tempReserve = 0;
+    s.reserved = 0;
+    sim::notify_state_changed();
+  }
+  return 0;
+}
+
+}  // extern "C"
