@@ -86,14 +86,14 @@ struct sink {
   }
 };
 
-struct spec {
+struct conversion {
   bool left = false, zero = false, plus = false, space = false, alt = false;
   int width = 0;
   int precision = -1;
 };
 
-// An integer with sign, base and the spec's padding.
-void put_integer(sink& s, const spec& f, uint64_t magnitude, bool negative, unsigned base, bool upper,
+// An integer with sign, base and the conversion's padding.
+void put_integer(sink& s, const conversion& f, uint64_t magnitude, bool negative, unsigned base, bool upper,
                  const char* prefix) {
   char digits[24];
   int n = 0;
@@ -119,7 +119,7 @@ void put_integer(sink& s, const spec& f, uint64_t magnitude, bool negative, unsi
   if (f.left) s.repeat(' ', pad);
 }
 
-void put_text(sink& s, const spec& f, const char* text) {
+void put_text(sink& s, const conversion& f, const char* text) {
   if (text == nullptr) text = "(null)";
   int n = 0;
   while (text[n] != 0 && (f.precision < 0 || n < f.precision)) ++n;
@@ -130,7 +130,7 @@ void put_text(sink& s, const spec& f, const char* text) {
 }
 
 // Fixed notation, for log lines: exact for magnitudes below 2^64 and up to 9 decimals.
-void put_fixed(sink& s, const spec& f, double v) {
+void put_fixed(sink& s, const conversion& f, double v) {
   char text[48];
   int n = 0;
   uint64_t bits;
@@ -138,12 +138,12 @@ void put_fixed(sink& s, const spec& f, double v) {
   const bool negative = (bits >> 63) != 0;
   if (negative) v = -v;
   if (v != v) {
-    spec g = f;
+    conversion g = f;
     g.precision = -1;
     return put_text(s, g, "nan");
   }
   if (v > 1.8e19) {
-    spec g = f;
+    conversion g = f;
     g.precision = -1;
     return put_text(s, g, negative ? "-inf" : "inf");
   }
@@ -174,7 +174,7 @@ void put_fixed(sink& s, const spec& f, double v) {
     for (int i = 0; i < precision; ++i) text[n++] = digits[i];
   }
   text[n] = 0;
-  spec g = f;
+  conversion g = f;
   g.precision = -1;
   put_text(s, g, text);
 }
@@ -192,7 +192,7 @@ int vsnprintf(char* out, size_t size, const char* format, va_list args) {
       s.put(*p);
       continue;
     }
-    spec f;
+    conversion f;
     for (++p;; ++p) {
       if (*p == '-') f.left = true;
       else if (*p == '0') f.zero = true;
@@ -251,7 +251,7 @@ int vsnprintf(char* out, size_t size, const char* format, va_list args) {
       }
       case 'c': {
         const char text[2] = {static_cast<char>(va_arg(args, int)), 0};
-        spec g = f;
+        conversion g = f;
         g.precision = -1;
         put_text(s, g, text);
         break;
