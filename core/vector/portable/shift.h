@@ -54,11 +54,11 @@ template <class L> inline chunk<L> shift_round(chunk<L> x, int s) {
 }  // namespace impl
 
 // vasr_rnd_usat: 16-bit lanes to u8: r[2i] = sat((v[i] + 2^(s-1)) >> s), r[2i+1] the
-// same of u[i], s = rt mod 16 (no rounding term for s = 0); i16 and u16 lanes.  HVX: vasr(Vu,Vv,Rt):rnd:sat
+// same of u[i], s = rt mod 8, as the instruction reads it (no rounding term for s = 0); i16 and u16 lanes.  HVX: vasr(Vu,Vv,Rt):rnd:sat
 template <class V, class R = vector_type<uint8_t, V::bytes>>
 inline nstd::on_if_t<lane_is_one_of<typename if_plain<V>::lane_t, int16_t, uint16_t>, R> vasr_rnd_usat(V u, V v, int rt) {
   typedef typename V::lane_t L;
-  const int s = rt & 15;
+  const int s = rt & 7;
   return map_chunks<L, R>(
       [s](chunk<L> a, chunk<L> b) {
         const chunk<L> ra = clamp_lanes<L>(impl::shift_round<L>(a, s), 0, 255);
