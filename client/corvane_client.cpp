@@ -10,6 +10,11 @@ AEEResult identity(const Image& src, Image& dst) {
   return call<method::identity>(&src.descriptor(), &src.mbuf(), &dst.mbuf());
 }
 
+AEEResult deinterleave2C(const Image& src, Image& plane0, Image& plane1) {
+  return call<method::deinterleave2C>(&src.descriptor(), &src.mbuf(), &plane0.descriptor(), &plane0.mbuf(),
+                                      &plane1.mbuf());
+}
+
 AEEResult load() { return call<method::load>(); }
 AEEResult init(uint32_t power_level) { return call<method::init>(power_level); }
 AEEResult setmode(uint32_t power_level) { return call<method::setmode>(power_level); }

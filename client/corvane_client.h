@@ -21,6 +21,9 @@ namespace client {
 // Copies the bytes that src's rows span (stride * rows) into dst.
 AEEResult identity(const Image& src, Image& dst);
 
+// Splits a two-channel image into two planes that share plane0's descriptor.
+AEEResult deinterleave2C(const Image& src, Image& plane0, Image& plane1);
+
 AEEResult load();
 AEEResult init(uint32_t power_level);
 AEEResult setmode(uint32_t power_level);

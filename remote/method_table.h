@@ -95,11 +95,11 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
       in(u8, "dstDepth")))                                                                                        \
   M(7, hvx_sum, later, (in(seq_u8, "src"), rout(seq_i32, "dst"), in(i32, "data_size"), in(i32, "depth"),          \
       in(i32, "cn")))                                                                                             \
-  M(8, deinterleave2C, later, (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),            \
+  M(8, deinterleave2C, built,  (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),            \
       rout(ombuf, "output0"), rout(ombuf, "output1")))                                                            \
-  M(9, deinterleave3C, later, (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),            \
+  M(9, deinterleave3C, built,  (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),            \
       rout(ombuf, "output0"), rout(ombuf, "output1"), rout(ombuf, "output2")))                                    \
-  M(10, deinterleave4C, later, (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),           \
+  M(10, deinterleave4C, built,  (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),           \
       rout(ombuf, "output0"), rout(ombuf, "output1"), rout(ombuf, "output2"), rout(ombuf, "output3")))            \
   M(11, convertScaleAbs, later, (in(mbufd, "desc_in"), in(mbufd, "desc_out"), in(imbuf, "src"),                   \
       rout(ombuf, "dst"), in(f64, "alpha"), in(f64, "beta")))                                                     \

@@ -21,12 +21,6 @@ AEEResult corvane_vdiv_mm(const uint8_t*, int, uint8_t, const uint8_t*, int, uin
     uint8_t) { return kNotBuilt; }
 AEEResult corvane_vdiv_scale(int32_t, const uint8_t*, int, uint8_t, uint8_t*, int, uint8_t) { return kNotBuilt; }
 AEEResult corvane_hvx_sum(const uint8_t*, int, int32_t*, int, int32_t, int32_t, int32_t) { return kNotBuilt; }
-AEEResult corvane_deinterleave2C(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
-    corvane_mbuf*) { return kNotBuilt; }
-AEEResult corvane_deinterleave3C(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
-    corvane_mbuf*, corvane_mbuf*) { return kNotBuilt; }
-AEEResult corvane_deinterleave4C(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
-    corvane_mbuf*, corvane_mbuf*, corvane_mbuf*) { return kNotBuilt; }
 AEEResult corvane_convertScaleAbs(const corvane_mbufd*, const corvane_mbufd*, const corvane_mbuf*, corvane_mbuf*,
     double, double) { return kNotBuilt; }
 AEEResult corvane_sobel8u(const uint8_t*, int, int32_t, int32_t, int32_t, uint8_t*, int,
