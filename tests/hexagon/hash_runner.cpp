@@ -1,5 +1,5 @@
-// Calls every built method through corvane_skel_invoke on fixed pseudo-random inputs, in
-// DualHVX (4 units) and in Scalar (0 units), and prints one FNV-1a hash per case and mode
+// Calls every built method through corvane_skel_invoke on fixed pseudo-random inputs, with
+// 4, 1 and 0 units (DualHVX, SingleHVX and Scalar where the method has them), and prints one FNV-1a hash per case and mode
 // of the result code, the primary output and every output buffer. Built for both builds;
 // compare_hashes.cmake fails when the host and qemu-hexagon print different lines.
 //
@@ -30,6 +30,11 @@ const hash_case kCases[] = {
     {m::identity, "tail", 3, {desc(100, 97, 3), seq(300), seq(300)}},
     {m::identity, "empty", 3, {desc(128, 128, 0), seq(0), seq(0)}},
     {m::identity, "one_row", 3, {desc(256, 200, 1), seq(256), seq(256)}},
+    {m::deinterleave2C, "u8", 5, {desc(256, 128, 3, 2), seq(256 * 3), desc(128, 128, 3), seq(128 * 3), seq(128 * 3)}},
+    {m::deinterleave2C, "i16_tail", 5, {desc(100, 25, 3, 2, 3), seq(300), desc(64, 25, 3, 1, 3), seq(256), seq(256)}},
+    {m::deinterleave2C, "f32_jobs", 5, {desc(6400, 800, 2, 2, 5), seq(12800), desc(3200, 800, 2, 1, 5), seq(6400), seq(6400)}},
+    {m::deinterleave3C, "plain", 6, {desc(192, 64, 1, 3), seq(192), desc(64, 64, 1), seq(64), seq(64), seq(64)}},
+    {m::deinterleave4C, "plain", 7, {desc(256, 64, 1, 4), seq(256), desc(64, 64, 1), seq(64), seq(64), seq(64), seq(64)}},
     {m::get_kernel_execution_time, "plain", 4, {arg{}, arg{}, seq(16), u8(1)}},
     {m::DoesNothing_ButLooksCool, "plain", 0, {}},
     {m::DoesNothing_ButLooksCool_ProEdition, "plain", 0, {}},
@@ -45,7 +50,7 @@ struct mode_run {
   const char* name;
   int units;
 };
-constexpr mode_run kModes[] = {{"DualHVX", 4}, {"Scalar", 0}};
+constexpr mode_run kModes[] = {{"DualHVX", 4}, {"SingleHVX", 1}, {"Scalar", 0}};
 
 uint64_t run(const hash_case& hc, uint64_t seed) {
   reset_arena();
@@ -79,7 +84,7 @@ extern "C" int main() {
     for (const mode_run& mode : kModes) {
       corvane_platform_set_units(mode.units);
       const uint64_t h = run(hc, seed);
-      out::print("%-36s %-8s %-14s %016llx\n", corvane::remote::kMethods[hc.method].name, mode.name, hc.label,
+      out::print("%-36s %-9s %-14s %016llx\n", corvane::remote::kMethods[hc.method].name, mode.name, hc.label,
                  static_cast<unsigned long long>(h));
     }
   }
