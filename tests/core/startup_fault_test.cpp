@@ -20,6 +20,7 @@ TEST(FailedStartUp, EveryInitialisedPathAnswersOne) {
   corvane_mbufd desc = {128, 128, 2, 1, 0, 0, 0, 0, 0};
   corvane_mbuf src = {a, 256}, dst = {b, 256};
   EXPECT_EQ(1, corvane_identity(&desc, &src, &dst));
+  EXPECT_EQ(1, corvane_deinterleave2C(&desc, &src, &desc, &dst, &dst));
   for (unsigned char byte : b) ASSERT_EQ(0xA5, byte);
   EXPECT_EQ(0, test::counters().reserve_calls) << "nothing is reserved";
 
