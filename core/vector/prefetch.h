@@ -23,16 +23,10 @@ constexpr uint64_t fetch_box_descriptor(uint16_t img_width, uint16_t box_width, 
          static_cast<uint64_t>(static_cast<uint16_t>(img_width * pixel_size)) << 32;
 }
 
-// The instruction with a descriptor that the caller packed itself.
-inline void L2fetch(const void* addr, uint32_t param) {
-#if defined(__hexagon__)
-  __asm__ __volatile__("l2fetch(%0,%1)" : : "r"(addr), "r"(param) : "memory");
-#else
-  (void)addr;
-  (void)param;
-#endif
-}
-inline void L2fetch(const void* addr, uint64_t param) {
+// The instruction with a descriptor that the caller packed itself: a 32-bit word for a
+// linear fetch, a 64-bit word for a box.
+template <class Word> inline void L2fetch(const void* addr, Word param) {
+  static_assert(sizeof(Word) == 4 || sizeof(Word) == 8, "a descriptor is one or two words");
 #if defined(__hexagon__)
   __asm__ __volatile__("l2fetch(%0,%1)" : : "r"(addr), "r"(param) : "memory");
 #else
