@@ -10,6 +10,11 @@ AEEResult identity(const Image& src, Image& dst) {
   return call<method::identity>(&src.descriptor(), &src.mbuf(), &dst.mbuf());
 }
 
+AEEResult boxfilter(const Image& in, int ddepth, int kw, int kh, bool normalize, Image& temp, Image& out) {
+  return call<method::boxfilter>(&in.descriptor(), &in.mbuf(), ddepth, kw, kh, uint8_t(normalize), &temp.descriptor(),
+                                 &temp.mbuf(), &out.descriptor(), &out.mbuf());
+}
+
 AEEResult deinterleave2C(const Image& src, Image& plane0, Image& plane1) {
   return call<method::deinterleave2C>(&src.descriptor(), &src.mbuf(), &plane0.descriptor(), &plane0.mbuf(),
                                       &plane1.mbuf());

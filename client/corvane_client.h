@@ -21,6 +21,12 @@ namespace client {
 // Copies the bytes that src's rows span (stride * rows) into dst.
 AEEResult identity(const Image& src, Image& dst);
 
+// Sum (or mean, if `normalize`) of each kw x kh window of `in` into `out`, with `temp` as
+// the ring of row sums: 2 * kh rows of at least one 128-byte pair (SingleHVX) or
+// 256-byte pair (DualHVX) per input vector. ddepth: the output's depth code, 0 to 5 for
+// 8-bit input, 2 to 5 for 16-bit input.
+AEEResult boxfilter(const Image& in, int ddepth, int kw, int kh, bool normalize, Image& temp, Image& out);
+
 // Splits a two-channel image into two planes that share plane0's descriptor.
 AEEResult deinterleave2C(const Image& src, Image& plane0, Image& plane1);
 

@@ -167,7 +167,7 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
   M(39, morphologyEx, later, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "tmpDesc"), rout(ombuf, "tmp"),   \
       in(mbufd, "dstDesc"), rout(ombuf, "dst"), in(i32, "kernel"), in(i32, "iterations"),                         \
       in(i32, "kernelShape"), in(i32, "borderType"), in(i32, "borderValue"), in(u32, "op")))                      \
-  M(40, boxfilter, later, (in(mbufd, "input_desc"), in(imbuf, "input"), in(i32, "ddepth"),                        \
+  M(40, boxfilter, built, (in(mbufd, "input_desc"), in(imbuf, "input"), in(i32, "ddepth"),                        \
       in(i32, "kernel_width"), in(i32, "kernel_height"), in(u8, "normalize"), in(mbufd, "temp_desc"),             \
       in(imbuf, "temp"), in(mbufd, "output_desc"), rout(ombuf, "output")))                                        \
   M(41, median_blur_3x3, later, (in(mbufd, "desc"), in(imbuf, "src"), rout(ombuf, "dst")))                        \

@@ -70,8 +70,6 @@ AEEResult corvane_morphOp(const corvane_mbufd*, const corvane_mbuf*, const corva
     int32_t, int32_t, int32_t, int32_t, uint32_t) { return kNotBuilt; }
 AEEResult corvane_morphologyEx(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
     const corvane_mbufd*, corvane_mbuf*, int32_t, int32_t, int32_t, int32_t, int32_t, uint32_t) { return kNotBuilt; }
-AEEResult corvane_boxfilter(const corvane_mbufd*, const corvane_mbuf*, int32_t, int32_t, int32_t, uint8_t,
-    const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*) { return kNotBuilt; }
 AEEResult corvane_median_blur_3x3(const corvane_mbufd*, const corvane_mbuf*, corvane_mbuf*) { return kNotBuilt; }
 AEEResult corvane_pyrDown(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*,
     corvane_mbuf*) { return kNotBuilt; }
