@@ -1,0 +1,176 @@
+// Registers every case's rows with Google Benchmark and runs them: the reference row
+// first, then ours in each mode, each of ours with its ratio to the reference.
+#include "bench/harness.h"
+
+#include <benchmark/benchmark.h>
+
+#include <chrono>
+#include <cstdio>
+#include <cstdlib>
+#include <map>
+#include <memory>
+#include <thread>
+
+#include "corvane_platform.h"
+
+namespace corvane {
+namespace bench {
+
+namespace {
+
+std::vector<case_list (*)()>& makers() {
+  static std::vector<case_list (*)()> all;
+  return all;
+}
+
+// A case with its images, made on first use and kept for every row of the case.
+struct live_case {
+  bench_case spec;
+  std::unique_ptr<calls> made;
+  double reference_seconds = 0;  // per call; 0 until measured
+  calls& get() {
+    if (!made) made = std::make_unique<calls>(spec.setup());
+    return *made;
+  }
+};
+
+using clock_type = std::chrono::steady_clock;
+double seconds_since(clock_type::time_point t0) {
+  return std::chrono::duration<double>(clock_type::now() - t0).count();
+}
+
+// The reference's time per call measured here, when its own row was filtered out.
+double measure_reference(const std::function<void()>& reference) {
+  reference();
+  int64_t n = 0;
+  const auto t0 = clock_type::now();
+  while (n < 5 || seconds_since(t0) < 0.3) {
+    reference();
+    ++n;
+  }
+  return seconds_since(t0) / double(n);
+}
+
+// Every row carries the same counters: the CSV output takes its columns from the first
+// row it prints.
+void set_counters(benchmark::State& state, double ratio, int units) {
+  state.counters["ratio"] = ratio;
+  state.counters["units"] = units;
+}
+
+void run_reference(benchmark::State& state, live_case* c) {
+  set_counters(state, 1, 0);
+  const std::function<void()>& reference = c->get().reference;
+  if (!reference) {
+    state.SkipWithError(("OpenCV has no such " + c->spec.reference_name).c_str());
+    return;
+  }
+  state.SetLabel(c->spec.reference_name);
+  const auto t0 = clock_type::now();
+  for (auto _ : state) {
+    reference();
+    benchmark::ClobberMemory();
+  }
+  c->reference_seconds = seconds_since(t0) / double(state.iterations());
+  state.SetBytesProcessed(state.iterations() * c->spec.bytes);
+  state.SetItemsProcessed(state.iterations() * c->spec.pixels);
+}
+
+void run_ours(benchmark::State& state, live_case* c, tools::mode m) {
+  const int n = c->spec.method;
+  const int units = tools::units_for(m, tools::kMethodModes[n].modes);
+  set_counters(state, 0, units);
+  if (!remote::kMethods[n].built) {
+    state.SkipWithError("not built yet (answers 20)");
+    return;
+  }
+  calls& made = c->get();
+  corvane_platform_set_units(units);
+  const AEEResult first = made.ours();
+  if (first != 0) {
+    corvane_platform_reset();
+    state.SkipWithError(("answered " + std::to_string(first)).c_str());
+    return;
+  }
+  AEEResult result = 0;
+  const auto t0 = clock_type::now();
+  for (auto _ : state) {
+    result |= made.ours();
+    benchmark::ClobberMemory();
+  }
+  const double ours_seconds = seconds_since(t0) / double(state.iterations());
+  corvane_platform_reset();
+  if (result != 0) {
+    state.SkipWithError("a timed call failed");
+    return;
+  }
+  if (made.reference) {
+    if (c->reference_seconds == 0) c->reference_seconds = measure_reference(made.reference);
+    set_counters(state, ours_seconds / c->reference_seconds, units);
+  }
+  state.SetBytesProcessed(state.iterations() * c->spec.bytes);
+  state.SetItemsProcessed(state.iterations() * c->spec.pixels);
+}
+
+// Every case's rows; the cases live as long as the process.
+bool register_all(bool mode_given, tools::mode only) {
+  static std::vector<std::unique_ptr<live_case>> cases;
+  for (auto make : makers())
+    for (bench_case& spec : make()) {
+      cases.push_back(std::make_unique<live_case>());
+      live_case* c = cases.back().get();
+      c->spec = std::move(spec);
+      const unsigned has = tools::kMethodModes[c->spec.method].modes & c->spec.modes;
+      if (!c->spec.reference_name.empty())
+        benchmark::RegisterBenchmark((c->spec.name + "/opencv").c_str(), run_reference, c)->UseRealTime();
+      for (tools::mode m : tools::kAllModes)
+        if (tools::has(has, m) && (!mode_given || m == only))
+          benchmark::RegisterBenchmark((c->spec.name + "/" + tools::mode_key(m)).c_str(), run_ours, c, m)
+              ->UseRealTime();
+    }
+  return true;
+}
+
+}  // namespace
+
+registrar::registrar(case_list (*make)()) { makers().push_back(make); }
+
+cv::Mat as_mat(const Image& image) { return as_mat(const_cast<Image&>(image)); }
+
+cv::Mat as_mat(Image& image) {
+  int depth = CV_8U;
+  switch (image.depth()) {
+    case client::U8: depth = CV_8U; break;
+    case client::I8: depth = CV_8S; break;
+    case client::U16: depth = CV_16U; break;
+    case client::I16: depth = CV_16S; break;
+    case client::I32: depth = CV_32S; break;
+    case client::F32: depth = CV_32F; break;
+  }
+  return cv::Mat(image.rows(), image.cols(), CV_MAKETYPE(depth, image.channels()), image.data(),
+                 size_t(image.stride()));
+}
+
+}  // namespace bench
+}  // namespace corvane
+
+int main(int argc, char** argv) {
+  namespace tools = corvane::tools;
+  bool mode_given = false;
+  tools::mode only = tools::DualHVX;
+  if (const char* env = std::getenv("CORVANE_MODE"); env != nullptr && *env != '\0') {
+    if (!tools::parse_mode(env, only)) {
+      std::fprintf(stderr, "corvane_bench: CORVANE_MODE wants scalar, shvx or dhvx, not '%s'\n", env);
+      return 2;
+    }
+    mode_given = true;
+  }
+  benchmark::Initialize(&argc, argv);
+  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 2;
+  corvane::bench::register_all(mode_given, only);
+  benchmark::AddCustomContext("opencv_threads", std::to_string(cv::getNumThreads()));
+  benchmark::AddCustomContext("hardware_threads", std::to_string(std::thread::hardware_concurrency()));
+  benchmark::RunSpecifiedBenchmarks();
+  benchmark::Shutdown();
+  return 0;
+}
