@@ -63,8 +63,7 @@ bench_case boxfilter_case(const boxfilter_member& m) {
               reference = nullptr;  // OpenCV lacks this combination of types
             }
             return calls{[img, m] {
-                           return tools::call_boxfilter(img->src, m.ddepth, m.width, m.height, m.normalize, img->ring,
-                                                        img->dst);
+                           return client::boxfilter(img->src, m.ddepth, m.width, m.height, m.normalize, img->ring, img->dst);
                          },
                          reference};
           }};

@@ -11,14 +11,18 @@
 // pixels. CORVANE_MODE=scalar|shvx|dhvx keeps one mode. A method not built yet (its
 // exported function answers 20) is reported as skipped.
 //
-// Adding a kernel takes a few lines in bench/<subsystem>_bench.cpp:
+// Adding a kernel takes a few lines in bench/<subsystem>_bench.cpp (a new file joins
+// corvane_bench's sources in bench/CMakeLists.txt):
 //
+//   struct median_images {                      // built once, when the case first runs
+//     Image src{kFrameCols, kFrameRows, 1, client::U8}, dst{kFrameCols, kFrameRows, 1, client::U8};
+//   };
 //   CORVANE_BENCH_CASES(median_cases) {
-//     return {{"median_blur_3x3/1920x1080_u8", method::median_blur_3x3, ALL_ITS_MODES,
-//              frame_pixels, 2 * frame_bytes, "cv::medianBlur", [] {
-//       auto img = std::make_shared<images>(...);          // built once, on first use
-//       return calls{[img] { return call<method::median_blur_3x3>(...); },
-//                    [img] { cv::medianBlur(img->src_mat, img->dst_mat, 3); }};
+//     return {{"median_blur_3x3/1920x1080_u8", method::median_blur_3x3, tools::ALL, kFramePixels,
+//              2 * kFramePixels, "cv::medianBlur", [] {
+//       auto img = std::make_shared<median_images>();
+//       return calls{[img] { return client::median_blur_3x3(img->src, img->dst); },
+//                    [img, s = as_mat(img->src), d = as_mat(img->dst)]() mutable { cv::medianBlur(s, d, 3); }};
 //     }}};
 //   }
 //

@@ -1,5 +1,5 @@
-// What a box filter call needs beside its input: the output's element type for a
-// `ddepth`, the scratch ring of row sums, and the call itself through the remote entry.
+// What a box filter call (client::boxfilter) needs beside its input: the output's
+// element type for a `ddepth`, the output image and the scratch ring of row sums.
 // Shared by the CLI, the demo and the benchmarks.
 #ifndef CORVANE_TOOLS_BOXFILTER_ARGS_H
 #define CORVANE_TOOLS_BOXFILTER_ARGS_H
@@ -41,13 +41,6 @@ inline client::Image boxfilter_output(const client::Image& input, int ddepth, ui
   const int rounded = (elements + client::kRowAlignment - 1) / client::kRowAlignment * client::kRowAlignment;
   return client::canary_image(input.cols(), input.rows(), input.channels(), depth,
                               (rounded > 0 ? rounded : client::kRowAlignment) * client::element_size(depth), fill);
-}
-
-inline AEEResult call_boxfilter(const client::Image& in, int ddepth, int kernel_width, int kernel_height, bool normalize,
-                           client::Image& ring, client::Image& out) {
-  return client::call<client::method::boxfilter>(&in.descriptor(), &in.mbuf(), ddepth, kernel_width, kernel_height,
-                                                 uint8_t(normalize ? 1 : 0), &ring.descriptor(), &ring.mbuf(),
-                                                 &out.descriptor(), &out.mbuf());
 }
 
 }  // namespace tools

@@ -67,7 +67,7 @@ bool demo_boxfilter(const Image& src) {
     Image ring = tools::boxfilter_ring(src, kSize);
     Image dst = tools::boxfilter_output(src, 0, 0xA5);
     const auto start = std::chrono::steady_clock::now();
-    const AEEResult r = tools::call_boxfilter(src, 0, kSize, kSize, true, ring, dst);
+    const AEEResult r = corvane::client::boxfilter(src, 0, kSize, kSize, true, ring, dst);
     const double ms = ms_since(start);
     if (r == 20) {
       std::printf("boxfilter not built yet (answers 20): skipped\n");

@@ -199,7 +199,7 @@ int run(const options& o) {
             type_name(in.depth() == client::U8 ? client::U8 : client::I16) + "->" + type_name(out.depth()) +
             (o.normalize ? " mean" : " sum");
     call = [&, ddepth, ring]() mutable {
-      return call_boxfilter(in, ddepth, o.kernel_width, o.kernel_height, o.normalize, ring, out);
+      return client::boxfilter(in, ddepth, o.kernel_width, o.kernel_height, o.normalize, ring, out);
     };
   }
 
