@@ -7,7 +7,8 @@
 #
 #   -b   build directory holding bench/corvane_bench (default build/host)
 #   -o   the report (default BUILD_DIR/bench-report.md; the chart is REPORT.png)
-#   benchmark options go to Google Benchmark, e.g. --benchmark_filter=boxfilter
+#   benchmark options go to Google Benchmark, e.g. --benchmark_filter=boxfilter, or
+#   --benchmark_repetitions=5 (the table then shows the medians)
 #   CORVANE_MODE=scalar|shvx|dhvx keeps one mode.
 set -euo pipefail
 
@@ -19,7 +20,7 @@ while [ $# -gt 0 ]; do
     -b) build=$2; shift 2 ;;
     -o) report=$2; shift 2 ;;
     --) shift; break ;;
-    -h|--help) sed -n '2,12p' "$0" | sed 's/^# \{0,1\}//'; exit 0 ;;
+    -h|--help) sed -n '2,13p' "$0" | sed 's/^# \{0,1\}//'; exit 0 ;;
     *) echo "bench-report: unknown argument $1 (try --help)" >&2; exit 2 ;;
   esac
 done
@@ -80,6 +81,9 @@ function mode_name(key) {
 started {
   split_csv($0, f)
   name = f[col["name"]]
+  # With repetitions, the median row stands for the case.
+  if (name ~ /_(mean|stddev|cv)$/) next
+  sub(/_median$/, "", name)
   sub(/\/real_time$/, "", name)
   mode = name; sub(/.*\//, "", mode)
   kase = name; sub(/\/[^\/]*$/, "", kase)
