@@ -21,7 +21,7 @@ struct hash_case {
   int method;
   const char* label;
   int nargs;
-  arg args[8];
+  arg args[10];
 };
 
 // Images stay small: under qemu each 128 bytes of HVX output costs about 2.5 us.
@@ -35,6 +35,19 @@ const hash_case kCases[] = {
     {m::deinterleave2C, "f32_jobs", 5, {desc(6400, 800, 2, 2, 5), seq(12800), desc(3200, 800, 2, 1, 5), seq(6400), seq(6400)}},
     {m::deinterleave3C, "plain", 6, {desc(192, 64, 1, 3), seq(192), desc(64, 64, 1), seq(64), seq(64), seq(64)}},
     {m::deinterleave4C, "plain", 7, {desc(256, 64, 1, 4), seq(256), desc(64, 64, 1), seq(64), seq(64), seq(64), seq(64)}},
+    // boxfilter: input, ddepth, W, H, normalize, ring (2H rows), output; strides fit both vector lengths.
+    {m::boxfilter, "u8_3x3_mean", 10, {desc(256, 200, 9), seq(256 * 9), i32(0), i32(3), i32(3), u8(1),
+                                       desc(512, 1, 6), seq(512 * 6), desc(256, 200, 9), seq(256 * 9)}},
+    {m::boxfilter, "f32_5x7_sum_3c", 10, {desc(256, 43, 10, 3), seq(256 * 10), i32(5), i32(5), i32(7), u8(0),
+                                          desc(512, 1, 14), seq(512 * 14), desc(1024, 43, 10, 3, 5), seq(1024 * 10)}},
+    {m::boxfilter, "i16_15x15_mean", 10, {desc(128, 100, 17), seq(128 * 17), i32(2), i32(15), i32(15), u8(1),
+                                          desc(256, 1, 30), seq(256 * 30), desc(256, 100, 17, 1, 3), seq(256 * 17)}},
+    {m::boxfilter, "16s_i16_3x5_mean", 10, {desc(256, 70, 10, 1, 3), seq(256 * 10), i32(3), i32(3), i32(5), u8(1),
+                                            desc(512, 1, 10), seq(512 * 10), desc(256, 70, 10, 1, 3), seq(256 * 10)}},
+    {m::boxfilter, "16s_i32_9x3_sum_2c", 10, {desc(128, 30, 8, 2, 3), seq(128 * 8), i32(4), i32(9), i32(3), u8(0),
+                                              desc(256, 1, 6), seq(256 * 6), desc(256, 30, 8, 2, 4), seq(256 * 8)}},
+    {m::boxfilter, "refused_17x3", 10, {desc(128, 100, 4), seq(128 * 4), i32(0), i32(17), i32(3), u8(0),
+                                        desc(256, 1, 6), seq(256 * 6), desc(128, 100, 4), seq(128 * 4)}},
     {m::get_kernel_execution_time, "plain", 4, {arg{}, arg{}, seq(16), u8(1)}},
     {m::DoesNothing_ButLooksCool, "plain", 0, {}},
     {m::DoesNothing_ButLooksCool_ProEdition, "plain", 0, {}},
