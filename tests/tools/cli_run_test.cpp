@@ -109,8 +109,10 @@ TEST_F(CliRun, BadArgumentsFailAndLeaveTheOutputAlone) {
     EXPECT_NE(std::string::npos, output_.find("corvane run: ")) << output_;
     EXPECT_EQ("precious", bytes("out.png"));
   }
-  // No temporary file is left behind either.
-  EXPECT_NE(0, cli("run identity " + in + " " + out + " && ls " + dir_ + " | grep -q 'out.png.'"));
+  // Neither failures nor a success leave a temporary file behind.
+  ASSERT_EQ(0, cli("run identity " + in + " " + out)) << output_;
+  ASSERT_EQ(0, std::system(("LC_ALL=C ls " + dir_ + " > " + path("files.txt")).c_str()));
+  EXPECT_EQ("files.txt\nin.png\nin16.png\nlog.txt\nout.png\ntext.png\n", bytes("files.txt"));
 }
 
 TEST_F(CliRun, BoxFilterWritesAMeanOrSaysItIsNotBuilt) {
