@@ -25,6 +25,10 @@ namespace cv {
 namespace adsp {
 namespace box {
 
+// The per-vector steps are inlined into the row loop: as calls, their vector arguments
+// and results would go through memory.
+#define CORVANE_BOX_INLINE inline __attribute__((always_inline))
+
 // The lanes of a family in mode M: an input vector, and its sums as a pair of vectors
 // of twice-as-wide lanes in pixel order (lo holds the first half of the pixels).
 template <hvx::mode_enum M, int InputBytes> struct lanes_c;
@@ -53,7 +57,7 @@ template <class Sum, class In> inline Sum widen(In x) { return hvx::vcast<Sum>(h
 // are `left` and `right`; offset[k] is the byte distance of tap k (k pixels of all
 // channels), which the align instructions read modulo the vector size.
 template <hvx::mode_enum M, int InputBytes, int Rw>
-inline typename lanes_c<M, InputBytes>::sum_t horizontal_sum(hvx::gen_vec<M> left, hvx::gen_vec<M> center,
+CORVANE_BOX_INLINE typename lanes_c<M, InputBytes>::sum_t horizontal_sum(hvx::gen_vec<M> left, hvx::gen_vec<M> center,
                                                              hvx::gen_vec<M> right, const int* offset) {
   typedef typename lanes_c<M, InputBytes>::in_t in_t;
   typedef typename lanes_c<M, InputBytes>::sum_t sum_t;
@@ -79,7 +83,7 @@ template <class Pair, hvx::mode_enum M> inline void store_pair(hvx::gen_vec<M>* 
 // Output of the 8-bit family for input vector j: the 16-bit sums (wrapped), or their
 // mean sat16((s * norm + 0x8000) >> 16); then clamped to u8, as they are, or as floats.
 template <hvx::mode_enum M, class Out, bool Norm>
-inline void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi16_t<M>& sum, hvx::vi16x2 norm) {
+CORVANE_BOX_INLINE void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi16_t<M>& sum, hvx::vi16x2 norm) {
   typedef hvx::vi16_t<M> vi16;
   vi16 lo = hvx::lo(sum), hi = hvx::hi(sum);
   if constexpr (Norm) {
@@ -106,7 +110,7 @@ inline void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi16_t<M>& sum, h
 // Output of the 16-bit family: the 32-bit sums, or (s * norm mod 2^32) >> 16 with no
 // rounding term; then saturated to i16 or as they are.
 template <hvx::mode_enum M, class Out, bool Norm>
-inline void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi32_t<M>& sum, hvx::vi16x2 norm) {
+CORVANE_BOX_INLINE void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi32_t<M>& sum, hvx::vi16x2 norm) {
   typedef hvx::vi32_t<M> vi32;
   vi32 lo = hvx::lo(sum), hi = hvx::hi(sum);
   if constexpr (Norm) {
@@ -183,6 +187,8 @@ void filter_rows(gen_in& _input, gen_out& _buffer, gen_out& _output, const int H
     slot = slot + 1 == H ? 0 : slot + 1;
   }
 }
+
+#undef CORVANE_BOX_INLINE
 
 }  // namespace box
 
