@@ -158,12 +158,9 @@ int main(int argc, char** argv) {
   namespace tools = corvane::tools;
   bool mode_given = false;
   tools::mode only = tools::DualHVX;
-  if (const char* env = std::getenv("CORVANE_MODE"); env != nullptr && *env != '\0') {
-    if (!tools::parse_mode(env, only)) {
-      std::fprintf(stderr, "corvane_bench: CORVANE_MODE wants scalar, shvx or dhvx, not '%s'\n", env);
-      return 2;
-    }
-    mode_given = true;
+  if (!tools::mode_from_environment(mode_given, only)) {
+    std::fprintf(stderr, "corvane_bench: CORVANE_MODE wants scalar, shvx or dhvx\n");
+    return 2;
   }
   benchmark::Initialize(&argc, argv);
   if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 2;

@@ -7,6 +7,7 @@
 #ifndef CORVANE_TOOLS_METHOD_MODES_H
 #define CORVANE_TOOLS_METHOD_MODES_H
 
+#include <cstdlib>
 #include <string>
 
 #include "remote/method_table.h"
@@ -117,6 +118,13 @@ inline bool parse_mode(const std::string& text, mode& out) {
       return true;
     }
   return false;
+}
+
+// The mode CORVANE_MODE names, if it is set: false if it names none.
+inline bool mode_from_environment(bool& given, mode& m) {
+  const char* env = std::getenv("CORVANE_MODE");
+  given = env != nullptr && *env != '\0';
+  return !given || parse_mode(env, m);
 }
 
 // "Scalar, SingleHVX, DualHVX", "control", "none (answers 4)": the README's wording.

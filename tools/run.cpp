@@ -217,7 +217,7 @@ int run(const options& o) {
     return 1;
   }
   if (o.method == "boxfilter" && used == Scalar)
-    std::fprintf(stderr, "corvane run: boxfilter has no Scalar variant; the output is left at 0\n");
+    std::fprintf(stderr, "corvane run: the box filter's Scalar mode writes nothing; the output is all 0\n");
   write_png(o.out_path, png_ready(out));
   std::printf("%s  %s  %dx%d, %d channel(s): %.3f ms -> %s\n", what.c_str(), mode_name(used), in.cols(), in.rows(),
               in.channels(), ms, o.out_path.c_str());
@@ -225,16 +225,6 @@ int run(const options& o) {
 }
 
 }  // namespace
-
-bool mode_from_environment(bool& given, mode& m, const char*& error) {
-  const char* env = std::getenv("CORVANE_MODE");
-  given = env != nullptr && *env != '\0';
-  if (given && !parse_mode(env, m)) {
-    error = "CORVANE_MODE wants scalar, shvx or dhvx";
-    return false;
-  }
-  return true;
-}
 
 void print_run_usage(FILE* out) {
   std::fprintf(out,
@@ -254,10 +244,8 @@ void print_run_usage(FILE* out) {
 int run_command(int argc, char** argv) {
   try {
     options o = parse(argc, argv);
-    if (!o.mode_given) {
-      const char* error = nullptr;
-      if (!mode_from_environment(o.mode_given, o.m, error)) throw usage_error(error);
-    }
+    if (!o.mode_given && !mode_from_environment(o.mode_given, o.m))
+      throw usage_error("CORVANE_MODE wants scalar, shvx or dhvx");
     return run(o);
   } catch (const usage_error& e) {
     std::fprintf(stderr, "corvane run: %s\n", e.what());

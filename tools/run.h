@@ -15,9 +15,6 @@ int run_command(int argc, char** argv);
 
 void print_run_usage(FILE* out);
 
-// The mode named by CORVANE_MODE; false with `error` set if it names none.
-bool mode_from_environment(bool& given, mode& m, const char*& error);
-
 }  // namespace tools
 }  // namespace corvane
 
