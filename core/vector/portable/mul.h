@@ -49,6 +49,14 @@ template <class V> inline widened_signed<if_lanes<V, uint8_t>> vmpy(V u, vi8x4 r
 // vmpy by half-words: lo[i] = u[2i] * rt.h[0], hi[i] = u[2i+1] * rt.h[1]; i16 to i32.  HVX: vmpy(Vu.h,Rt.h)
 template <class V> inline widened<if_lanes<V, int16_t>> vmpy(V u, vi16x2 rt) {
   const int32_t f0 = rt[0], f1 = rt[1];
+#if CORVANE_GCC_SSE2
+  // pmaddwd against the half-word pairs (f0, 0) and (0, f1): one exact product per word.
+  const sse_halves fe = (sse_halves)splat_lanes<int32_t>(static_cast<int32_t>(static_cast<uint16_t>(f0)));
+  const sse_halves fo = (sse_halves)splat_lanes<int32_t>(static_cast<int32_t>(static_cast<uint32_t>(static_cast<uint16_t>(f1)) << 16));
+  return map_even_odd<int32_t, widened<V>>(
+      [fe](chunk<int32_t> a) { return (chunk<int32_t>)__builtin_ia32_pmaddwd128((sse_halves)a, fe); },
+      [fo](chunk<int32_t> a) { return (chunk<int32_t>)__builtin_ia32_pmaddwd128((sse_halves)a, fo); }, u);
+#endif
   return map_even_odd<int32_t, widened<V>>(
       [f0](chunk<int32_t> a) { return mul_wrap<int32_t>(even_lanes<int32_t>(a), splat_lanes<int32_t>(f0)); },
       [f1](chunk<int32_t> a) { return mul_wrap<int32_t>(odd_lanes<int32_t>(a), splat_lanes<int32_t>(f1)); }, u);

@@ -80,11 +80,55 @@ template <class V> inline wide_of<if_plain<V>> vdeal(V u, V v, int rt) {
   return impl::shuffle_network(u, v, rt, false);
 }
 
-// interleave: pair lane 2i = even[i], 2i+1 = odd[i], in lane order.  HVX: vshuff(Vy,Vx,-lane bytes)
-template <class T> inline wide_of<T> interleave(T odd, T even) { return portable::vshuff(odd, even, -lane_bytes<T>()); }
+// interleave: pair lane 2i = even[i], 2i+1 = odd[i], in lane order. The same as
+// vshuff(odd, even, -lane bytes), written as the lane loop it amounts to, which the
+// compiler turns into unpack instructions.  HVX: vshuff(Vy,Vx,-lane bytes)
+template <class T> inline wide_of<T> interleave(T odd, T even) {
+  typedef typename T::lane_t L;
+  constexpr size_t n = T::lanes;
+  L e[n], o[n], r[2 * n];
+  __builtin_memcpy(e, &even.value, sizeof(e));
+  __builtin_memcpy(o, &odd.value, sizeof(o));
+  for (size_t i = 0; i < n; ++i) {
+    r[2 * i] = e[i];
+    r[2 * i + 1] = o[i];
+  }
+  wide_of<T> w;
+  __builtin_memcpy(&w.value, r, sizeof(r));
+  return w;
+}
 
-// deinterleave: the inverse of interleave.  HVX: vdeal(Vy,Vx,-lane bytes)
-template <class T> inline wide_of<T> deinterleave(T odd, T even) { return portable::vdeal(odd, even, -lane_bytes<T>()); }
+namespace impl {
+// Lanes First, First + 2, First + 4, ... of the run a, b of two chunks.
+template <class L, size_t First, size_t... I>
+inline chunk<L> every_other(chunk<L> a, chunk<L> b, nstd::integer_sequence<size_t, I...>) {
+#if defined(__clang__)
+  return __builtin_shufflevector(a, b, (2 * I + First)...);
+#else
+  typedef typename lane_traits<L>::unsigned_t U;
+  typedef U mask_t __attribute__((vector_size(chunk_bytes)));
+  return __builtin_shuffle(a, b, mask_t{static_cast<U>(2 * I + First)...});
+#endif
+}
+}  // namespace impl
+
+// deinterleave: the inverse of interleave: of the run even, odd, lo takes the even lanes
+// and hi the odd ones. The same as vdeal(odd, even, -lane bytes), written chunk by chunk
+// as constant shuffles, which compile to pack instructions.  HVX: vdeal(Vy,Vx,-lane bytes)
+template <class T> inline wide_of<T> deinterleave(T odd, T even) {
+  typedef typename T::lane_t L;
+  constexpr size_t chunks = sizeof(T) / chunk_bytes;
+  const nstd::make_integer_sequence<size_t, chunk_bytes / sizeof(L)> lanes{};
+  wide_of<T> w;
+  for_chunks<sizeof(T)>([&](size_t k) {
+    // chunks 2k and 2k + 1 of the run even, odd
+    const chunk<L> a = 2 * k < chunks ? ld<L>(even, 2 * k) : ld<L>(odd, 2 * k - chunks);
+    const chunk<L> b = 2 * k + 1 < chunks ? ld<L>(even, 2 * k + 1) : ld<L>(odd, 2 * k + 1 - chunks);
+    st(w, k, impl::every_other<L, 0>(a, b, lanes));
+    st(w, k + chunks, impl::every_other<L, 1>(a, b, lanes));
+  });
+  return w;
+}
 
 namespace impl {
 template <class V> inline V delta_network(V u, V c, bool rising) {
