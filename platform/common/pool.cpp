@@ -72,7 +72,7 @@ void dspCV_worker_pool_synctoken_init(dspCV_synctoken_t* token, unsigned int job
 void dspCV_worker_pool_synctoken_jobdone(dspCV_synctoken_t* token) {
   sim::guard g;
   token->done = token->done + 1;
-  sim::notify_state_changed();
+  if (token->done >= token->jobs) sim::notify_state_changed();  // only the waiter cares, and only then
 }
 
 void dspCV_worker_pool_synctoken_wait(dspCV_synctoken_t* token) {
