@@ -138,6 +138,21 @@ void mul64(uint64_t a, uint64_t b, uint64_t* hi, uint64_t* lo) {
   *hi = hh + (lh >> 32) + (hl >> 32) + (mid >> 32);
 }
 
+// Restoring division of two mantissas (ma >= mb): `bits` quotient bits, the last one
+// ORed with whether a remainder is left (the sticky bit of the rounding).
+template <class U> U divide_mantissas(U ma, U mb, int bits) {
+  U q = 0, r = ma;
+  for (int i = 0; i < bits; ++i) {
+    q <<= 1;
+    if (r >= mb) {
+      r -= mb;
+      q |= 1;
+    }
+    r <<= 1;
+  }
+  return q | (r != 0);
+}
+
 }  // namespace
 
 extern "C" {
@@ -204,16 +219,7 @@ float __hexagon_divsf3(float fa, float fb) {
     --e;
   }
   // 27 quotient bits, the first one 1, and the remainder as sticky bit.
-  uint32_t q = 0, r = ma;
-  for (int i = 0; i < 27; ++i) {
-    q <<= 1;
-    if (r >= mb) {
-      r -= mb;
-      q |= 1;
-    }
-    r <<= 1;
-  }
-  return pack_f32(sign, e, q | (r != 0));
+  return pack_f32(sign, e, divide_mantissas<uint32_t>(ma, mb, 27));
 }
 
 double __hexagon_divdf3(double fa, double fb) {
@@ -235,16 +241,7 @@ double __hexagon_divdf3(double fa, double fb) {
     ma <<= 1;
     --e;
   }
-  uint64_t q = 0, r = ma;
-  for (int i = 0; i < 56; ++i) {
-    q <<= 1;
-    if (r >= mb) {
-      r -= mb;
-      q |= 1;
-    }
-    r <<= 1;
-  }
-  return pack_f64(sign, e, q | (r != 0));
+  return pack_f64(sign, e, divide_mantissas<uint64_t>(ma, mb, 56));
 }
 
 double __hexagon_muldf3(double fa, double fb) {
