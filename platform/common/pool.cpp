@@ -25,8 +25,8 @@ void pool_thread(void*) {
     {
       sim::guard g;
       while (queue.head == queue.tail) sim::wait_state_changed();
+      if (queue.tail - queue.head == kQueueJobs) sim::notify_state_changed();  // a full queue gets a free slot
       job = queue.jobs[queue.head++ % kQueueJobs];
-      sim::notify_state_changed();  // a slot is free
     }
     job.fptr(job.dptr);
   }

@@ -39,6 +39,7 @@ struct state {
   int total_units;         // units the platform has
   int reserved;            // units this process holds
   int used;                // units held by locked contexts
+  int lock_waiters;        // threads sleeping in a waiting dspCV_hvx_lock
   int forced_lock_result;  // 0, or what dspCV_hvx_lock answers instead of locking
   bool fail_power_requests;
   bool fail_hvx_power_on;

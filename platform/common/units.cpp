@@ -43,7 +43,7 @@ void release_context(state& s, thread_state* t) {
   s.used -= t->locked_units;
   t->locked_units = 0;
   t->locked_vlen = 0;
-  notify_state_changed();
+  if (s.lock_waiters > 0) notify_state_changed();
 }
 
 }  // namespace
@@ -140,7 +140,9 @@ int dspCV_hvx_lock(dspCV_hvx_mode_t mode, unsigned int wait) {
       return t->locked_vlen;
     }
     if (!wait) return -1;
+    ++s.lock_waiters;
     sim::wait_state_changed();
+    --s.lock_waiters;
   }
 }
 
