@@ -25,11 +25,11 @@ std::vector<case_list (*)()>& makers() {
 
 // A case with its images, made on first use and kept for every row of the case.
 struct live_case {
-  bench_case spec;
+  bench_case bcase;
   std::unique_ptr<calls> made;
   double reference_seconds = 0;  // per call; 0 until measured
   calls& get() {
-    if (!made) made = std::make_unique<calls>(spec.setup());
+    if (!made) made = std::make_unique<calls>(bcase.setup());
     return *made;
   }
 };
@@ -62,22 +62,22 @@ void run_reference(benchmark::State& state, live_case* c) {
   set_counters(state, 1, 0);
   const std::function<void()>& reference = c->get().reference;
   if (!reference) {
-    state.SkipWithError(("OpenCV has no such " + c->spec.reference_name).c_str());
+    state.SkipWithError(("OpenCV has no such " + c->bcase.reference_name).c_str());
     return;
   }
-  state.SetLabel(c->spec.reference_name);
+  state.SetLabel(c->bcase.reference_name);
   const auto t0 = clock_type::now();
   for (auto _ : state) {
     reference();
     benchmark::ClobberMemory();
   }
   c->reference_seconds = seconds_since(t0) / double(state.iterations());
-  state.SetBytesProcessed(state.iterations() * c->spec.bytes);
-  state.SetItemsProcessed(state.iterations() * c->spec.pixels);
+  state.SetBytesProcessed(state.iterations() * c->bcase.bytes);
+  state.SetItemsProcessed(state.iterations() * c->bcase.pixels);
 }
 
 void run_ours(benchmark::State& state, live_case* c, tools::mode m) {
-  const int n = c->spec.method;
+  const int n = c->bcase.method;
   const int units = tools::units_for(m, tools::kMethodModes[n].modes);
   set_counters(state, 0, units);
   if (!remote::kMethods[n].built) {
@@ -108,24 +108,24 @@ void run_ours(benchmark::State& state, live_case* c, tools::mode m) {
     if (c->reference_seconds == 0) c->reference_seconds = measure_reference(made.reference);
     set_counters(state, ours_seconds / c->reference_seconds, units);
   }
-  state.SetBytesProcessed(state.iterations() * c->spec.bytes);
-  state.SetItemsProcessed(state.iterations() * c->spec.pixels);
+  state.SetBytesProcessed(state.iterations() * c->bcase.bytes);
+  state.SetItemsProcessed(state.iterations() * c->bcase.pixels);
 }
 
 // Every case's rows; the cases live as long as the process.
 bool register_all(bool mode_given, tools::mode only) {
   static std::vector<std::unique_ptr<live_case>> cases;
   for (auto make : makers())
-    for (bench_case& spec : make()) {
+    for (bench_case& bcase : make()) {
       cases.push_back(std::make_unique<live_case>());
       live_case* c = cases.back().get();
-      c->spec = std::move(spec);
-      const unsigned has = tools::kMethodModes[c->spec.method].modes & c->spec.modes;
-      if (!c->spec.reference_name.empty())
-        benchmark::RegisterBenchmark((c->spec.name + "/opencv").c_str(), run_reference, c)->UseRealTime();
+      c->bcase = std::move(bcase);
+      const unsigned has = tools::kMethodModes[c->bcase.method].modes & c->bcase.modes;
+      if (!c->bcase.reference_name.empty())
+        benchmark::RegisterBenchmark((c->bcase.name + "/opencv").c_str(), run_reference, c)->UseRealTime();
       for (tools::mode m : tools::kAllModes)
         if (tools::has(has, m) && (!mode_given || m == only))
-          benchmark::RegisterBenchmark((c->spec.name + "/" + tools::mode_key(m)).c_str(), run_ours, c, m)
+          benchmark::RegisterBenchmark((c->bcase.name + "/" + tools::mode_key(m)).c_str(), run_ours, c, m)
               ->UseRealTime();
     }
   return true;
