@@ -36,9 +36,7 @@ template <class Job> void run_direct_job(Job& job, void (*worker)(void*), unsign
   job.next_worker = 0;
   job.status = 0;
   dspCV_worker_pool_synctoken_init(&job.token, threads);
-  for (unsigned i = 0; i < threads; ++i)
-    if (dspCV_worker_pool_submit({worker, &job}) != 0) job.done();  // a refused job counts as done
-  dspCV_worker_pool_synctoken_wait(&job.token);
+  loop_detail::submit_and_wait(job.token, worker, &job, threads);
 }
 
 }  // namespace hvx

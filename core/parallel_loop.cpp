@@ -10,15 +10,13 @@ bool compute_recommended() {
   return query.value != COMPUTE_RECOMMENDATION_NOT_OK;
 }
 
-namespace {
-
-// Submits `threads` jobs of `callback` over `info` and waits for all of them. A job the
-// pool refused counts as done, so that the wait ends.
-template <class Loop> void run_team(callback_info<Loop>& info, void (*callback)(void*), unsigned threads) {
-  for (unsigned i = 0; i < threads; ++i)
-    if (dspCV_worker_pool_submit({callback, &info}) != 0) dspCV_worker_pool_synctoken_jobdone(&info.token);
-  dspCV_worker_pool_synctoken_wait(&info.token);
+void submit_and_wait(dspCV_synctoken_t& token, void (*worker)(void*), void* data, unsigned jobs) {
+  for (unsigned i = 0; i < jobs; ++i)
+    if (dspCV_worker_pool_submit({worker, data}) != 0) dspCV_worker_pool_synctoken_jobdone(&token);
+  dspCV_worker_pool_synctoken_wait(&token);
 }
+
+namespace {
 
 template <class Loop> void init_info(callback_info<Loop>& info, Loop* loop, unsigned threads) {
   info.jobCount = 0;
@@ -61,7 +59,7 @@ AEEResult ParallelLoop::run_loop(ParallelLoop* loop, unsigned numberOfWorkers) {
   callback_info<ParallelLoop> info;
   loop_detail::init_info(info, loop, numThreads);
   if (loop->prolog(numThreads) != 0) return hvx::RESULT_LOOP_START;
-  loop_detail::run_team(info, callback, numThreads);
+  loop_detail::submit_and_wait(info.token, callback, &info, numThreads);
   return loop->epilog(numThreads) == 0 ? hvx::RESULT_OK : hvx::RESULT_LOOP_EPILOG;
 }
 
@@ -91,7 +89,7 @@ AEEResult ParallelLoop::run_loop(ParallelLoop* loop, unsigned numberOfWorkers) {
   if (loop->prolog(numThreads) != 0) return RESULT_LOOP_START;
   void (*callback)(void*) = loop->mode == SingleHVX ? callback_64 : loop->mode == DualHVX ? callback_128 : nullptr;
   if (callback == nullptr) return RESULT_LOOP_START;
-  loop_detail::run_team(info, callback, numThreads);
+  loop_detail::submit_and_wait(info.token, callback, &info, numThreads);
   return loop->epilog(numThreads) == 0 ? RESULT_OK : RESULT_LOOP_EPILOG;
 }
 

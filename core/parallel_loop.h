@@ -21,6 +21,9 @@ template <class Loop> struct callback_info {
 };
 // Whether the platform recommends compute now.
 bool compute_recommended();
+// Submits `jobs` jobs of worker(data) to the pool and waits on `token` (initialised for
+// them) until all are done. A job the pool refuses counts as done, so the wait ends.
+void submit_and_wait(dspCV_synctoken_t& token, void (*worker)(void*), void* data, unsigned jobs);
 }  // namespace loop_detail
 
 namespace cv {
