@@ -13,6 +13,14 @@ enum allowed_mode : int { NONE = 0, SCALAR = 1, SHVX = 2, DHVX = 4, HVX = 6, ALL
 
 namespace {
 
+// Kernel<M>::run under a waiting guard of M; 1 if the guard does not hold its mode.
+template <template <hvx::mode_enum> class Kernel, hvx::mode_enum M, class... Args>
+AEEResult run_locked(Args&&... args) {
+  hvx::mode_lock guard = hvx::lock(hvx::mode_c<M>::instance);
+  if (!guard.owns_mode()) return hvx::RESULT_NOT_READY;
+  return Kernel<M>::run(hvx::mode_c<M>::instance, nstd::forward<Args>(args)...);
+}
+
 // Runs Kernel<M>::run(mode_c<M>::instance, args...) in the best allowed mode. Ladders of
 // modes outside Allowed are not compiled.
 template <template <hvx::mode_enum> class Kernel, int Allowed, class... Args>
@@ -26,18 +34,10 @@ AEEResult invokeKernel(Args&&... args) {
       scoped_reservation reservation = reserve_all();
       const int reserved = scoped_reservation::query_reserved();
       if constexpr ((Allowed & DHVX) != 0) {
-        if (reserved >= 2) {
-          mode_lock guard = lock(mode_c<DualHVX>::instance);
-          if (!guard.owns_mode()) return RESULT_NOT_READY;
-          return Kernel<DualHVX>::run(mode_c<DualHVX>::instance, nstd::forward<Args>(args)...);
-        }
+        if (reserved >= 2) return run_locked<Kernel, DualHVX>(nstd::forward<Args>(args)...);
       }
       if constexpr ((Allowed & SHVX) != 0) {
-        if (reserved >= 1) {
-          mode_lock guard = lock(mode_c<SingleHVX>::instance);
-          if (!guard.owns_mode()) return RESULT_NOT_READY;
-          return Kernel<SingleHVX>::run(mode_c<SingleHVX>::instance, nstd::forward<Args>(args)...);
-        }
+        if (reserved >= 1) return run_locked<Kernel, SingleHVX>(nstd::forward<Args>(args)...);
       }
     }  // a scalar run holds no units
     if constexpr ((Allowed & SCALAR) != 0) {
