@@ -24,8 +24,8 @@ void pool_thread(void*) {
     dspCV_worker_job_t job;
     {
       sim::guard g;
-      while (queue.head == queue.tail) sim::wait_state_changed();
-      if (queue.tail - queue.head == kQueueJobs) sim::notify_state_changed();  // a full queue gets a free slot
+      while (queue.head == queue.tail) g.wait(sim::kJobQueued);
+      if (queue.tail - queue.head == kQueueJobs) g.wake_all(sim::kQueueChanged);  // a full queue gets a free slot
       job = queue.jobs[queue.head++ % kQueueJobs];
     }
     job.fptr(job.dptr);
@@ -51,15 +51,15 @@ int dspCV_worker_pool_submit(dspCV_worker_job_t job) {
     sim::guard g;
     queue.threads = started;
     queue.phase = 2;
-    sim::notify_state_changed();
+    g.wake_all(sim::kQueueChanged);
   }
   sim::guard g;
-  while (queue.phase != 2) sim::wait_state_changed();
+  while (queue.phase != 2) g.wait(sim::kQueueChanged);
   if (queue.threads == 0) return -1;
-  while (queue.tail - queue.head == kQueueJobs) sim::wait_state_changed();
+  while (queue.tail - queue.head == kQueueJobs) g.wait(sim::kQueueChanged);
   queue.jobs[queue.tail++ % kQueueJobs] = job;
   ++sim::the_state().counters.jobs_submitted;
-  sim::notify_state_changed();
+  g.wake_one(sim::kJobQueued);
   return 0;
 }
 
@@ -72,12 +72,12 @@ void dspCV_worker_pool_synctoken_init(dspCV_synctoken_t* token, unsigned int job
 void dspCV_worker_pool_synctoken_jobdone(dspCV_synctoken_t* token) {
   sim::guard g;
   token->done = token->done + 1;
-  if (token->done >= token->jobs) sim::notify_state_changed();  // only the waiter cares, and only then
+  if (token->done >= token->jobs) g.wake_all(sim::kTokenDone);  // only the waiter cares, and only then
 }
 
 void dspCV_worker_pool_synctoken_wait(dspCV_synctoken_t* token) {
   sim::guard g;
-  while (token->done < token->jobs) sim::wait_state_changed();
+  while (token->done < token->jobs) g.wait(sim::kTokenDone);
 }
 
 unsigned int dspCV_atomic_inc_return(unsigned int* target) {
@@ -118,7 +118,7 @@ int dspCV_hvx_cleanup_mt_job(dspCV_hvx_config_t* config) {
   if (config->tempReserve) {
     config->tempReserve = 0;
     s.reserved = 0;
-    sim::notify_state_changed();
+    g.wake_all(sim::kUnitsChanged);
   }
   return 0;
 }

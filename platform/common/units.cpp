@@ -38,12 +38,12 @@ void check_startup_faults(state& s) {
   s.startup_fault = same(fault, "init") ? 1 : same(fault, "power") ? 2 : 0;
 }
 
-void release_context(state& s, thread_state* t) {
+void release_context(guard& g, state& s, thread_state* t) {
   if (t->locked_units == 0) return;
   s.used -= t->locked_units;
   t->locked_units = 0;
   t->locked_vlen = 0;
-  if (s.lock_waiters > 0) notify_state_changed();
+  if (s.lock_waiters > 0) g.wake_all(kUnitsChanged);
 }
 
 }  // namespace
@@ -119,7 +119,7 @@ int dspCV_hvx_unreserve(void) {
   sim::state& s = the_state();
   ++s.counters.unreserve_calls;
   s.reserved = 0;
-  sim::notify_state_changed();  // waiting locks re-check against the smaller reservation
+  g.wake_all(sim::kUnitsChanged);  // waiting locks re-check against the smaller reservation
   return 0;
 }
 
@@ -129,7 +129,7 @@ int dspCV_hvx_lock(dspCV_hvx_mode_t mode, unsigned int wait) {
   ++s.counters.lock_calls;
   if (s.forced_lock_result != 0) return s.forced_lock_result;
   sim::thread_state* t = sim::current_thread();
-  sim::release_context(s, t);  // a thread holds at most one context
+  sim::release_context(g, s, t);  // a thread holds at most one context
   for (;;) {
     const int need = (mode == DSPCV_HVX_MODE_64B) ? 1 : (mode == DSPCV_HVX_MODE_128B || s.reserved >= 2) ? 2 : 1;
     if (s.reserved < need) return -1;
@@ -141,7 +141,7 @@ int dspCV_hvx_lock(dspCV_hvx_mode_t mode, unsigned int wait) {
     }
     if (!wait) return -1;
     ++s.lock_waiters;
-    sim::wait_state_changed();
+    g.wait(sim::kUnitsChanged);
     --s.lock_waiters;
   }
 }
@@ -151,7 +151,7 @@ int dspCV_hvx_unlock(void) {
   guard g;
   sim::state& s = the_state();
   ++s.counters.unlock_calls;
-  sim::release_context(s, sim::current_thread());
+  sim::release_context(g, s, sim::current_thread());
   return 0;
 }
 

@@ -175,7 +175,7 @@ namespace sim {
 
 namespace {
 rt::mutex state_mutex;
-volatile int state_changes;  // bumped by every notification; waiters sleep on it
+volatile int raised[kSignalCount];  // bumped each time a signal is raised; waiters sleep on it
 }  // namespace
 
 thread_state* current_thread() { return &rt::context()->state; }
@@ -183,16 +183,16 @@ thread_state* current_thread() { return &rt::context()->state; }
 void lock_state() { state_mutex.lock(); }
 void unlock_state() { state_mutex.unlock(); }
 
-void wait_state_changed() {
-  const int seen = __atomic_load_n(&state_changes, __ATOMIC_ACQUIRE);
+void wait_signal(signal s) {
+  const int seen = __atomic_load_n(&raised[s], __ATOMIC_ACQUIRE);
   state_mutex.unlock();
-  rt::futex_wait(&state_changes, seen);
+  rt::futex_wait(&raised[s], seen);
   state_mutex.lock();
 }
 
-void notify_state_changed() {
-  __atomic_fetch_add(&state_changes, 1, __ATOMIC_RELEASE);
-  rt::futex_wake(&state_changes, 0x7fffffff);
+void raise_signal(signal s, int sleepers) {
+  __atomic_fetch_add(&raised[s], 1, __ATOMIC_RELEASE);
+  rt::futex_wake(&raised[s], sleepers);
 }
 
 const char* env(const char* name) {

@@ -1,5 +1,5 @@
 // The host's primitives under the simulated platform: a std::mutex with a condition
-// variable, thread_local thread state, getenv, stderr, the steady clock.
+// variable per signal, thread_local thread state, getenv, stderr, the steady clock.
 #include <chrono>
 #include <condition_variable>
 #include <cstdio>
@@ -21,9 +21,9 @@ std::mutex& state_mutex() {
   static std::mutex* m = new std::mutex;
   return *m;
 }
-std::condition_variable& state_changed() {
-  static std::condition_variable* cv = new std::condition_variable;
-  return *cv;
+std::condition_variable& signalled(signal s) {
+  static std::condition_variable* cv = new std::condition_variable[kSignalCount];
+  return cv[s];
 }
 // The lock held by the current thread, so that waiting can release it.
 thread_local std::unique_lock<std::mutex> held;
@@ -44,9 +44,12 @@ void lock_state() { held = std::unique_lock<std::mutex>(state_mutex()); }
 
 void unlock_state() { held.unlock(); }
 
-void wait_state_changed() { state_changed().wait(held); }
+void wait_signal(signal s) { signalled(s).wait(held); }
 
-void notify_state_changed() { state_changed().notify_all(); }
+void raise_signal(signal s, int sleepers) {
+  if (sleepers >= kWakeAll) return signalled(s).notify_all();
+  for (int i = 0; i < sleepers; ++i) signalled(s).notify_one();
+}
 
 const char* env(const char* name) { return std::getenv(name); }
 
