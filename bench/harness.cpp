@@ -4,6 +4,7 @@
 
 #include <benchmark/benchmark.h>
 
+#include <algorithm>
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
@@ -27,7 +28,6 @@ std::vector<case_list (*)()>& makers() {
 struct live_case {
   bench_case bcase;
   std::unique_ptr<calls> made;
-  double reference_seconds = 0;  // per call; 0 until measured
   calls& get() {
     if (!made) made = std::make_unique<calls>(bcase.setup());
     return *made;
@@ -39,16 +39,26 @@ double seconds_since(clock_type::time_point t0) {
   return std::chrono::duration<double>(clock_type::now() - t0).count();
 }
 
-// The reference's time per call measured here, when its own row was filtered out.
-double measure_reference(const std::function<void()>& reference) {
-  reference();
-  int64_t n = 0;
+// Our time per call over the reference's, from calls made in pairs, one of each back to
+// back, so that both see the same machine: the median of the pairs' ratios. On a shared
+// machine whose speed drifts from one second to the next, two rows timed apart can
+// differ by half, far more than the difference being measured.
+double paired_ratio(const calls& made) {
+  std::vector<double> ratios;
   const auto t0 = clock_type::now();
-  while (n < 5 || seconds_since(t0) < 0.3) {
-    reference();
-    ++n;
+  for (int round = 0; ratios.size() < 21 || seconds_since(t0) < 0.1; ++round) {
+    const bool ours_first = round % 2 == 0;  // neither side always finds the other's data in cache
+    const auto a = clock_type::now();
+    ours_first ? (void)made.ours() : made.reference();
+    const auto b = clock_type::now();
+    ours_first ? made.reference() : (void)made.ours();
+    const auto c = clock_type::now();
+    const double first = std::chrono::duration<double>(b - a).count();
+    const double second = std::chrono::duration<double>(c - b).count();
+    ratios.push_back(ours_first ? first / second : second / first);
   }
-  return seconds_since(t0) / double(n);
+  std::nth_element(ratios.begin(), ratios.begin() + ratios.size() / 2, ratios.end());
+  return ratios[ratios.size() / 2];
 }
 
 // Every row carries the same counters: the CSV output takes its columns from the first
@@ -66,12 +76,10 @@ void run_reference(benchmark::State& state, live_case* c) {
     return;
   }
   state.SetLabel(c->bcase.reference_name);
-  const auto t0 = clock_type::now();
   for (auto _ : state) {
     reference();
     benchmark::ClobberMemory();
   }
-  c->reference_seconds = seconds_since(t0) / double(state.iterations());
   state.SetBytesProcessed(state.iterations() * c->bcase.bytes);
   state.SetItemsProcessed(state.iterations() * c->bcase.pixels);
 }
@@ -93,21 +101,17 @@ void run_ours(benchmark::State& state, live_case* c, tools::mode m) {
     return;
   }
   AEEResult result = 0;
-  const auto t0 = clock_type::now();
   for (auto _ : state) {
     result |= made.ours();
     benchmark::ClobberMemory();
   }
-  const double ours_seconds = seconds_since(t0) / double(state.iterations());
+  const double ratio = made.reference ? paired_ratio(made) : 0;
   corvane_platform_reset();
   if (result != 0) {
     state.SkipWithError("a timed call failed");
     return;
   }
-  if (made.reference) {
-    if (c->reference_seconds == 0) c->reference_seconds = measure_reference(made.reference);
-    set_counters(state, ours_seconds / c->reference_seconds, units);
-  }
+  if (made.reference) set_counters(state, ratio, units);
   state.SetBytesProcessed(state.iterations() * c->bcase.bytes);
   state.SetItemsProcessed(state.iterations() * c->bcase.pixels);
 }

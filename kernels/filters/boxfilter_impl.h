@@ -25,9 +25,10 @@ namespace cv {
 namespace adsp {
 namespace box {
 
-// The per-vector steps are inlined into the row loop: as calls, their vector arguments
-// and results would go through memory.
-#define CORVANE_BOX_INLINE inline __attribute__((always_inline))
+// The row loop is flattened: every vector step in it is inlined, whatever the size of
+// the unit (twice 160 row loops in one), since as calls their vector arguments and
+// results would go through memory and the align distances would no longer be constants.
+#define CORVANE_BOX_FLAT __attribute__((flatten))
 
 // The lanes of a family in mode M: an input vector, and its sums as a pair of vectors
 // of twice-as-wide lanes in pixel order (lo holds the first half of the pixels).
@@ -54,18 +55,18 @@ template <hvx::mode_enum M, out_kind O> using out_vec_t = typename out_vec_c<M, 
 template <class Sum, class In> inline Sum widen(In x) { return hvx::vcast<Sum>(hvx::vunpack(x)); }
 
 // The sum over the taps -Rw .. Rw of the vector `center`, whose neighbours in the row
-// are `left` and `right`; offset[k] is the byte distance of tap k (k pixels of all
-// channels), which the align instructions read modulo the vector size.
+// are `left` and `right`; tap k lies k * pixel_bytes bytes away (k pixels of all
+// channels), a distance the align instructions read modulo the vector size.
 template <hvx::mode_enum M, int InputBytes, int Rw>
-CORVANE_BOX_INLINE typename lanes_c<M, InputBytes>::sum_t horizontal_sum(hvx::gen_vec<M> left, hvx::gen_vec<M> center,
-                                                             hvx::gen_vec<M> right, const int* offset) {
+inline typename lanes_c<M, InputBytes>::sum_t horizontal_sum(hvx::gen_vec<M> left, hvx::gen_vec<M> center,
+                                                             hvx::gen_vec<M> right, int pixel_bytes) {
   typedef typename lanes_c<M, InputBytes>::in_t in_t;
   typedef typename lanes_c<M, InputBytes>::sum_t sum_t;
   sum_t acc = widen<sum_t>(in_t(center));
 #pragma GCC unroll 8
   for (int k = 1; k <= Rw; ++k) {
-    acc = hvx::vadd_w(acc, widen<sum_t>(in_t(hvx::vlalign(center, left, offset[k]))));
-    acc = hvx::vadd_w(acc, widen<sum_t>(in_t(hvx::valign(right, center, offset[k]))));
+    acc = hvx::vadd_w(acc, widen<sum_t>(in_t(hvx::vlalign(center, left, k * pixel_bytes))));
+    acc = hvx::vadd_w(acc, widen<sum_t>(in_t(hvx::valign(right, center, k * pixel_bytes))));
   }
   return acc;
 }
@@ -83,7 +84,7 @@ template <class Pair, hvx::mode_enum M> inline void store_pair(hvx::gen_vec<M>* 
 // Output of the 8-bit family for input vector j: the 16-bit sums (wrapped), or their
 // mean sat16((s * norm + 0x8000) >> 16); then clamped to u8, as they are, or as floats.
 template <hvx::mode_enum M, class Out, bool Norm>
-CORVANE_BOX_INLINE void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi16_t<M>& sum, hvx::vi16x2 norm) {
+inline void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi16_t<M>& sum, hvx::vi16x2 norm) {
   typedef hvx::vi16_t<M> vi16;
   vi16 lo = hvx::lo(sum), hi = hvx::hi(sum);
   if constexpr (Norm) {
@@ -110,7 +111,7 @@ CORVANE_BOX_INLINE void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi16_
 // Output of the 16-bit family: the 32-bit sums, or (s * norm mod 2^32) >> 16 with no
 // rounding term; then saturated to i16 or as they are.
 template <hvx::mode_enum M, class Out, bool Norm>
-CORVANE_BOX_INLINE void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi32_t<M>& sum, hvx::vi16x2 norm) {
+inline void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi32_t<M>& sum, hvx::vi16x2 norm) {
   typedef hvx::vi32_t<M> vi32;
   vi32 lo = hvx::lo(sum), hi = hvx::hi(sum);
   if constexpr (Norm) {
@@ -126,9 +127,10 @@ CORVANE_BOX_INLINE void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi32_
 }
 
 // The whole image for one W, output and normalisation; H and its reciprocal come from
-// the member.
-template <hvx::mode_enum M, int InputBytes, int W, class Out, bool Norm>
-void filter_rows(gen_in& _input, gen_out& _buffer, gen_out& _output, const int H, const int16_t norm) {
+// the member. Channels is the input's channel count when it is known here (1), so that
+// the taps' distances are constants, or 0 to read it from the descriptor.
+template <hvx::mode_enum M, int InputBytes, int W, class Out, bool Norm, int Channels>
+CORVANE_BOX_FLAT void filter_rows_of(gen_in& _input, gen_out& _buffer, gen_out& _output, const int H, const int16_t norm) {
   typedef hvx::gen_vec<M> vec;
   typedef typename lanes_c<M, InputBytes>::sum_t sum_t;
   constexpr int N = static_cast<int>(hvx::mode_vector_bytes<M>);
@@ -141,14 +143,13 @@ void filter_rows(gen_in& _input, gen_out& _buffer, gen_out& _output, const int H
   const int rows = input.rows();
   if (rows <= 0) return;
   const int R = H / 2;
-  const int channels = input.channels();
+  const int channels = Channels != 0 ? Channels : input.channels();
   const int vectors_per_row = (input.cols() * channels + pixels_per_vector - 1) / pixels_per_vector;
   const size_t input_stride = input.stride_vectors();                                  // [vectors]
   const size_t ring_pitch = static_cast<unsigned>(ring.stride_bytes()) / (2 * N) * 2;  // [vectors], whole pairs
   const size_t output_stride = output.stride_vectors();                                // [vectors]
 
-  int offset[Rw + 1];  // [bytes]
-  for (int k = 0; k <= Rw; ++k) offset[k] = k * channels * InputBytes;
+  const int pixel_bytes = channels * InputBytes;
 
   const hvx::vi16x2 norm_vec(norm, norm);
   const vec zero = hvx::vzero<vec>();
@@ -169,7 +170,7 @@ void filter_rows(gen_in& _input, gen_out& _buffer, gen_out& _output, const int H
       for (int j = 0; j < vectors_per_row; ++j) {
         // The row ends at its stride: bytes past cols up to there are summed as they are.
         const vec right = static_cast<size_t>(j + 1) < input_stride ? row[j + 1] : zero;
-        const sum_t hsum = horizontal_sum<M, InputBytes, Rw>(left, center, right, offset);
+        const sum_t hsum = horizontal_sum<M, InputBytes, Rw>(left, center, right, pixel_bytes);
         sum_t sum = hsum;
         if (!first) {
           sum = hvx::vadd_w(load_pair<sum_t>(prev_sums, j), hsum);
@@ -188,7 +189,18 @@ void filter_rows(gen_in& _input, gen_out& _buffer, gen_out& _output, const int H
   }
 }
 
-#undef CORVANE_BOX_INLINE
+// Single-channel images, the common case, get their own row loop: with the taps'
+// distances fixed, the portable align is a register shift instead of a trip through
+// memory.
+template <hvx::mode_enum M, int InputBytes, int W, class Out, bool Norm>
+void filter_rows(gen_in& _input, gen_out& _buffer, gen_out& _output, const int H, const int16_t norm) {
+  if (_input.channels() == 1)
+    filter_rows_of<M, InputBytes, W, Out, Norm, 1>(_input, _buffer, _output, H, norm);
+  else
+    filter_rows_of<M, InputBytes, W, Out, Norm, 0>(_input, _buffer, _output, H, norm);
+}
+
+#undef CORVANE_BOX_FLAT
 
 }  // namespace box
 

@@ -17,16 +17,30 @@ struct job_queue {
   int threads;    // started
   int phase;      // 0 no threads yet, 1 being started by the first submit, 2 running
 };
-job_queue queue;  // guarded by sim::lock_state
+job_queue queue;  // guarded by sim::lock_state; head and tail are also peeked at without it
+
+// A thread about to sleep on the pool first polls for a while: waking a sleeping thread
+// costs tens of microseconds on a virtual machine, more than many runs take, and the
+// next job or a token's last jobdone usually comes sooner than that.
+constexpr uint64_t kPollMicroseconds = 50;
+
+template <class Ready> void poll_before_sleeping(Ready ready) {
+  const uint64_t until = sim::now_us() + kPollMicroseconds;
+  while (!ready() && sim::now_us() < until) sim::yield_thread();
+}
+
+bool job_queued() { return __atomic_load_n(&queue.head, __ATOMIC_RELAXED) != __atomic_load_n(&queue.tail, __ATOMIC_RELAXED); }
 
 void pool_thread(void*) {
   for (;;) {
     dspCV_worker_job_t job;
+    poll_before_sleeping(job_queued);
     {
       sim::guard g;
       while (queue.head == queue.tail) g.wait(sim::kJobQueued);
       if (queue.tail - queue.head == kQueueJobs) g.wake_all(sim::kQueueChanged);  // a full queue gets a free slot
-      job = queue.jobs[queue.head++ % kQueueJobs];
+      job = queue.jobs[queue.head % kQueueJobs];
+      __atomic_store_n(&queue.head, queue.head + 1, __ATOMIC_RELAXED);
     }
     job.fptr(job.dptr);
   }
@@ -57,7 +71,8 @@ int dspCV_worker_pool_submit(dspCV_worker_job_t job) {
   while (queue.phase != 2) g.wait(sim::kQueueChanged);
   if (queue.threads == 0) return -1;
   while (queue.tail - queue.head == kQueueJobs) g.wait(sim::kQueueChanged);
-  queue.jobs[queue.tail++ % kQueueJobs] = job;
+  queue.jobs[queue.tail % kQueueJobs] = job;
+  __atomic_store_n(&queue.tail, queue.tail + 1, __ATOMIC_RELAXED);
   ++sim::the_state().counters.jobs_submitted;
   g.wake_one(sim::kJobQueued);
   return 0;
@@ -71,11 +86,12 @@ void dspCV_worker_pool_synctoken_init(dspCV_synctoken_t* token, unsigned int job
 
 void dspCV_worker_pool_synctoken_jobdone(dspCV_synctoken_t* token) {
   sim::guard g;
-  token->done = token->done + 1;
+  __atomic_store_n(&token->done, token->done + 1, __ATOMIC_RELAXED);  // also peeked at by the waiter
   if (token->done >= token->jobs) g.wake_all(sim::kTokenDone);  // only the waiter cares, and only then
 }
 
 void dspCV_worker_pool_synctoken_wait(dspCV_synctoken_t* token) {
+  poll_before_sleeping([token] { return __atomic_load_n(&token->done, __ATOMIC_RELAXED) >= token->jobs; });
   sim::guard g;
   while (token->done < token->jobs) g.wait(sim::kTokenDone);
 }

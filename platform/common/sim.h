@@ -45,6 +45,7 @@ void raise_signal(signal s, int sleepers);  // wakes up to `sleepers` threads wa
 const char* env(const char* name);  // start-up configuration, null if unset
 void write_log(const char* text, size_t length);
 uint64_t now_us();
+void yield_thread();  // lets another runnable thread have the processor
 // Starts fn(arg) on a new thread that lives as long as the process; false if none.
 bool start_thread(void (*fn)(void*), void* arg);
 

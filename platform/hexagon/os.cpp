@@ -195,6 +195,8 @@ void raise_signal(signal s, int sleepers) {
   rt::futex_wake(&raised[s], sleepers);
 }
 
+void yield_thread() { rt::syscall(rt::SYS_sched_yield, 0, 0); }
+
 const char* env(const char* name) {
   if (const char* value = rt::option(name)) return value;
   if (rt::start_envp == nullptr) return nullptr;

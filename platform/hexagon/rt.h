@@ -16,6 +16,7 @@ enum sysno : int {
   SYS_exit_group = 94,
   SYS_futex = 98,
   SYS_clock_gettime = 113,
+  SYS_sched_yield = 124,
   SYS_gettid = 178,
   SYS_munmap = 215,
   SYS_clone = 220,

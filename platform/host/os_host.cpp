@@ -60,6 +60,8 @@ uint64_t now_us() {
   return static_cast<uint64_t>(duration_cast<microseconds>(steady_clock::now().time_since_epoch()).count());
 }
 
+void yield_thread() { std::this_thread::yield(); }
+
 bool start_thread(void (*fn)(void*), void* arg) {
   try {
     std::thread(fn, arg).detach();

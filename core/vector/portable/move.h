@@ -13,7 +13,29 @@ CORVANE_PORTABLE_INLINE namespace portable {
 namespace impl {
 // r[i] = cat[i + s] with cat = v then u, 0 <= s <= N: one unaligned read from a buffer
 // that holds both vectors, which beats any run-time shuffle on SSE2.
+#if CORVANE_GCC_SSE2 && defined(__OPTIMIZE__)
+typedef long long sse_quads __attribute__((vector_size(16)));
+// The same for a shift known when compiling (0 < s mod 16, s < N): each chunk of the
+// result is two neighbouring chunks of the run joined by whole-register byte shifts,
+// whose counts are immediates; no round trip through memory.
+template <class V> __attribute__((always_inline)) inline V align_bytes_fixed(const V& u, const V& v, size_t s) {
+  constexpr size_t n = sizeof(V) / chunk_bytes;
+  const size_t q = s / chunk_bytes, r = s % chunk_bytes;
+  V out;
+  for_chunks<sizeof(V)>([&](size_t c) {
+    const size_t k = c + q;  // chunks k and k + 1 of the run v, u
+    const sse_quads a = k < n ? ld<long long>(v, k) : ld<long long>(u, k - n);
+    const sse_quads b = k + 1 < n ? ld<long long>(v, k + 1) : ld<long long>(u, k + 1 - n);
+    st(out, c, __builtin_ia32_psrldqi128(a, static_cast<int>(8 * r)) |
+                   __builtin_ia32_pslldqi128(b, static_cast<int>(8 * (chunk_bytes - r))));
+  });
+  return out;
+}
+#endif
 template <class V> inline V align_bytes(const V& u, const V& v, size_t s) {
+#if CORVANE_GCC_SSE2 && defined(__OPTIMIZE__)
+  if (__builtin_constant_p(s) && s % chunk_bytes != 0 && s < sizeof(V)) return align_bytes_fixed(u, v, s);
+#endif
   alignas(16) uint8_t cat[2 * sizeof(V)];
   __builtin_memcpy(cat, &v, sizeof(V));
   __builtin_memcpy(cat + sizeof(V), &u, sizeof(V));

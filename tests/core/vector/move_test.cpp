@@ -35,26 +35,38 @@ LANE_TEST(VectorMove, vsplat) {
                std::vector<uint8_t>(S::n, static_cast<uint8_t>(w)));
 }
 
+// Bytes sh .. sh + N - 1 of the run v, u.
+template <class V> std::vector<uint8_t> aligned_lanes(const V& u, const V& v, size_t sh) {
+  const auto a = lanes<uint8_t>(u), b = lanes<uint8_t>(v);
+  std::vector<uint8_t> want(V::lanes);
+  for (size_t i = 0; i < V::lanes; ++i) want[i] = i + sh < V::lanes ? b[i + sh] : a[i + sh - V::lanes];
+  return want;
+}
+
 LANE_TEST(VectorMove, valign) {
   typedef typename S::template v<uint8_t> V;
   const V u = rand_vec<V>(g), v = rand_vec<V>(g);
   const int rt = rand_shift(g);
-  const auto a = lanes<uint8_t>(u), b = lanes<uint8_t>(v);
-  const size_t n = V::lanes, sh = mod(rt, n);
-  std::vector<uint8_t> want(n);
-  for (size_t i = 0; i < n; ++i) want[i] = i + sh < n ? b[i + sh] : a[i + sh - n];
-  expect_lanes(hvx::valign(u, v, rt), want);
+  expect_lanes(hvx::valign(u, v, rt), aligned_lanes(u, v, mod(rt, V::lanes)));
 }
 
 LANE_TEST(VectorMove, vlalign) {
   typedef typename S::template v<uint8_t> V;
   const V u = rand_vec<V>(g), v = rand_vec<V>(g);
   const int rt = rand_shift(g);
-  const auto a = lanes<uint8_t>(u), b = lanes<uint8_t>(v);
-  const size_t n = V::lanes, sh = n - mod(rt, n);
-  std::vector<uint8_t> want(n);
-  for (size_t i = 0; i < n; ++i) want[i] = i + sh < n ? b[i + sh] : a[i + sh - n];
-  expect_lanes(hvx::vlalign(u, v, rt), want);
+  expect_lanes(hvx::vlalign(u, v, rt), aligned_lanes(u, v, V::lanes - mod(rt, V::lanes)));
+}
+
+// Distances known when compiling, as the filters' taps are, may take another path.
+template <int... K, class V> void expect_fixed_aligns(const V& u, const V& v) {
+  (expect_lanes(hvx::valign(u, v, K), aligned_lanes(u, v, mod(K, V::lanes))), ...);
+  (expect_lanes(hvx::vlalign(u, v, K), aligned_lanes(u, v, V::lanes - mod(K, V::lanes))), ...);
+}
+
+LANE_TEST(VectorMove, align_by_constants) {
+  typedef typename S::template v<uint8_t> V;
+  const V u = rand_vec<V>(g), v = rand_vec<V>(g);
+  expect_fixed_aligns<1, 2, 7, 15, 16, 17, 31, 33, 63, 64, 65, 100, 127, 129>(u, v);
 }
 
 LANE_TEST(VectorMove, vror) {
