@@ -39,22 +39,24 @@ double seconds_since(clock_type::time_point t0) {
   return std::chrono::duration<double>(clock_type::now() - t0).count();
 }
 
-// Our time per call over the reference's, from calls made in pairs, one of each back to
-// back, so that both see the same machine: the median of the pairs' ratios. On a shared
-// machine whose speed drifts from one second to the next, two rows timed apart can
-// differ by half, far more than the difference being measured.
+// Our time per call over the reference's, from runs of kRunCalls calls of one side
+// followed by as many of the other, so that both sides see the same machine: the median
+// over pairs of runs of their ratio. On a shared machine whose speed drifts from one
+// second to the next, two rows timed apart can differ by half, far more than the
+// difference being measured. The runs are long enough that moving the data between the
+// caches of the two sides costs little.
 double paired_ratio(const calls& made) {
+  constexpr int kRunCalls = 8;
+  auto run_seconds = [&](bool ours) {
+    const auto t0 = clock_type::now();
+    for (int i = 0; i < kRunCalls; ++i) ours ? (void)made.ours() : made.reference();
+    return seconds_since(t0);
+  };
   std::vector<double> ratios;
   const auto t0 = clock_type::now();
-  for (int round = 0; ratios.size() < 21 || seconds_since(t0) < 0.1; ++round) {
-    const bool ours_first = round % 2 == 0;  // neither side always finds the other's data in cache
-    const auto a = clock_type::now();
-    ours_first ? (void)made.ours() : made.reference();
-    const auto b = clock_type::now();
-    ours_first ? made.reference() : (void)made.ours();
-    const auto c = clock_type::now();
-    const double first = std::chrono::duration<double>(b - a).count();
-    const double second = std::chrono::duration<double>(c - b).count();
+  for (int round = 0; ratios.size() < 7 || seconds_since(t0) < 0.2; ++round) {
+    const bool ours_first = round % 2 == 0;  // neither side always runs after the other
+    const double first = run_seconds(ours_first), second = run_seconds(!ours_first);
     ratios.push_back(ours_first ? first / second : second / first);
   }
   std::nth_element(ratios.begin(), ratios.begin() + ratios.size() / 2, ratios.end());
@@ -86,7 +88,8 @@ void run_reference(benchmark::State& state, live_case* c) {
 
 void run_ours(benchmark::State& state, live_case* c, tools::mode m) {
   const int n = c->bcase.method;
-  const int units = tools::units_for(m, tools::kMethodModes[n].modes);
+  const char* forced = m == tools::Scalar ? nullptr : std::getenv("CORVANE_BENCH_UNITS");
+  const int units = forced ? std::atoi(forced) : tools::units_for(m, tools::kMethodModes[n].modes);
   set_counters(state, 0, units);
   if (!remote::kMethods[n].built) {
     state.SkipWithError("not built yet (answers 20)");

@@ -7,9 +7,11 @@
 //   <family>/<member>/opencv     the reference, labelled with what it calls
 //
 // and ours carry the counter `ratio`: our time per call divided by the reference's (below
-// 1 is faster). Rates: bytes_per_second counts the bytes read and written, items the
-// pixels. CORVANE_MODE=scalar|shvx|dhvx keeps one mode. A method not built yet (its
-// exported function answers 20) is reported as skipped.
+// 1 is faster), the median over pairs of back-to-back runs of 8 calls. Rates:
+// bytes_per_second counts the bytes read and written, items the pixels.
+// CORVANE_MODE=scalar|shvx|dhvx keeps one mode; CORVANE_BENCH_UNITS=n gives the vector
+// modes n units instead (a parallel loop's team follows the units). A method not built yet (its exported
+// function answers 20) is reported as skipped.
 //
 // Adding a kernel takes a few lines in bench/<subsystem>_bench.cpp (a new file joins
 // corvane_bench's sources in bench/CMakeLists.txt):
