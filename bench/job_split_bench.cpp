@@ -40,7 +40,8 @@ void split_range(const uint8_t* in, uint8_t* o0, uint8_t* o1, size_t begin, size
     const __m128i b = _mm_loadu_si128(reinterpret_cast<const __m128i*>(in + i + 16));
     _mm_storeu_si128(reinterpret_cast<__m128i*>(o0 + i / 2),
                      _mm_packus_epi16(_mm_and_si128(a, low), _mm_and_si128(b, low)));
-    _mm_storeu_si128(reinterpret_cast<__m128i*>(o1 + i / 2), _mm_packus_epi16(_mm_srli_epi16(a, 8), _mm_srli_epi16(b, 8)));
+    _mm_storeu_si128(reinterpret_cast<__m128i*>(o1 + i / 2),
+                     _mm_packus_epi16(_mm_srli_epi16(a, 8), _mm_srli_epi16(b, 8)));
   }
 }
 

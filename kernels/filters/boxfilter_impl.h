@@ -130,7 +130,8 @@ inline void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi32_t<M>& sum, h
 // the member. Channels is the input's channel count when it is known here (1), so that
 // the taps' distances are constants, or 0 to read it from the descriptor.
 template <hvx::mode_enum M, int InputBytes, int W, class Out, bool Norm, int Channels>
-CORVANE_BOX_FLAT void filter_rows_of(gen_in& _input, gen_out& _buffer, gen_out& _output, const int H, const int16_t norm) {
+CORVANE_BOX_FLAT void filter_rows_of(gen_in& _input, gen_out& _buffer, gen_out& _output, const int H,
+                                     const int16_t norm) {
   typedef hvx::gen_vec<M> vec;
   typedef typename lanes_c<M, InputBytes>::sum_t sum_t;
   constexpr int N = static_cast<int>(hvx::mode_vector_bytes<M>);

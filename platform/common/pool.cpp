@@ -29,7 +29,9 @@ template <class Ready> void poll_before_sleeping(Ready ready) {
   while (!ready() && sim::now_us() < until) sim::yield_thread();
 }
 
-bool job_queued() { return __atomic_load_n(&queue.head, __ATOMIC_RELAXED) != __atomic_load_n(&queue.tail, __ATOMIC_RELAXED); }
+bool job_queued() {
+  return __atomic_load_n(&queue.head, __ATOMIC_RELAXED) != __atomic_load_n(&queue.tail, __ATOMIC_RELAXED);
+}
 
 void pool_thread(void*) {
   for (;;) {
