@@ -11,11 +11,9 @@ namespace hvx {
 CORVANE_PORTABLE_INLINE namespace portable {
 
 namespace impl {
-// r[i] = cat[i + s] with cat = v then u, 0 <= s <= N: one unaligned read from a buffer
-// that holds both vectors, which beats any run-time shuffle on SSE2.
 #if CORVANE_GCC_SSE2 && defined(__OPTIMIZE__)
 typedef long long sse_quads __attribute__((vector_size(16)));
-// The same for a shift known when compiling (0 < s mod 16, s < N): each chunk of the
+// align_bytes for a shift known when compiling (0 < s mod 16, s < N): each chunk of the
 // result is two neighbouring chunks of the run joined by whole-register byte shifts,
 // whose counts are immediates; no round trip through memory.
 template <class V> __attribute__((always_inline)) inline V align_bytes_fixed(const V& u, const V& v, size_t s) {
@@ -32,6 +30,8 @@ template <class V> __attribute__((always_inline)) inline V align_bytes_fixed(con
   return out;
 }
 #endif
+// r[i] = cat[i + s] with cat = v then u, 0 <= s <= N: one unaligned read from a buffer
+// that holds both vectors, which beats any run-time shuffle on SSE2.
 template <class V> inline V align_bytes(const V& u, const V& v, size_t s) {
 #if CORVANE_GCC_SSE2 && defined(__OPTIMIZE__)
   if (__builtin_constant_p(s) && s % chunk_bytes != 0 && s < sizeof(V)) return align_bytes_fixed(u, v, s);
