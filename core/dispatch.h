@@ -5,6 +5,7 @@
 
 #include "core/hvx_modes.h"
 #include "core/membuf.h"
+#include "core/reach.h"
 #include "core/result.h"
 
 namespace hvx {
@@ -13,35 +14,42 @@ enum allowed_mode : int { NONE = 0, SCALAR = 1, SHVX = 2, DHVX = 4, HVX = 6, ALL
 
 namespace {
 
-// Kernel<M>::run under a waiting guard of M; 1 if the guard does not hold its mode.
+// Kernel<M>::run, once Kernel<M>::reach(args...) has been found inside the buffers (else
+// 14, nothing touched); a vector mode runs under a waiting guard of M, and answers 1 if
+// the guard does not hold its mode.
 template <template <hvx::mode_enum> class Kernel, hvx::mode_enum M, class... Args>
-AEEResult run_locked(Args&&... args) {
-  hvx::mode_lock guard = hvx::lock(hvx::mode_c<M>::instance);
-  if (!guard.owns_mode()) return hvx::RESULT_NOT_READY;
-  return Kernel<M>::run(hvx::mode_c<M>::instance, nstd::forward<Args>(args)...);
+AEEResult run_checked(Args&&... args) {
+  if (!Kernel<M>::reach(args...).fits()) return hvx::RESULT_BAD_POINTER;
+  if constexpr (M == hvx::Scalar) {
+    return Kernel<M>::run(hvx::mode_c<M>::instance, nstd::forward<Args>(args)...);
+  } else {
+    hvx::mode_lock guard = hvx::lock(hvx::mode_c<M>::instance);
+    if (!guard.owns_mode()) return hvx::RESULT_NOT_READY;
+    return Kernel<M>::run(hvx::mode_c<M>::instance, nstd::forward<Args>(args)...);
+  }
 }
 
-// Runs Kernel<M>::run(mode_c<M>::instance, args...) in the best allowed mode. Ladders of
-// modes outside Allowed are not compiled.
+// Runs Kernel<M>::run(mode_c<M>::instance, args...) in the best allowed mode, checked
+// against Kernel<M>::reach(args...). Ladders of modes outside Allowed are not compiled.
 template <template <hvx::mode_enum> class Kernel, int Allowed, class... Args>
 AEEResult invokeKernel(Args&&... args) {
   using namespace hvx;
   if (!IsInitialized()) return RESULT_NOT_READY;
   if constexpr (Allowed == SCALAR) {
-    return Kernel<Scalar>::run(mode_c<Scalar>::instance, nstd::forward<Args>(args)...);
+    return run_checked<Kernel, Scalar>(nstd::forward<Args>(args)...);
   } else {
     {
       scoped_reservation reservation = reserve_all();
       const int reserved = scoped_reservation::query_reserved();
       if constexpr ((Allowed & DHVX) != 0) {
-        if (reserved >= 2) return run_locked<Kernel, DualHVX>(nstd::forward<Args>(args)...);
+        if (reserved >= 2) return run_checked<Kernel, DualHVX>(nstd::forward<Args>(args)...);
       }
       if constexpr ((Allowed & SHVX) != 0) {
-        if (reserved >= 1) return run_locked<Kernel, SingleHVX>(nstd::forward<Args>(args)...);
+        if (reserved >= 1) return run_checked<Kernel, SingleHVX>(nstd::forward<Args>(args)...);
       }
     }  // a scalar run holds no units
     if constexpr ((Allowed & SCALAR) != 0) {
-      return Kernel<Scalar>::run(mode_c<Scalar>::instance, nstd::forward<Args>(args)...);
+      return run_checked<Kernel, Scalar>(nstd::forward<Args>(args)...);
     } else {
       return RESULT_NOT_READY;
     }

@@ -27,21 +27,14 @@ extern "C" CORVANE_API AEEResult corvane_boxfilter(const corvane_mbufd* input_de
     // Its own reservation finds the units held; its scalar branch runs inside ours.
     return invokeKernel<cv::adsp::boxfilter, ALL>(in, ddepth, kernel_width, kernel_height, normalize, ring, out);
   }
-  // No initialisation test on this path.
+  // No initialisation test on this path; the same ladder written out.
   const int reserved = scoped_reservation::query_reserved();
-  if (reserved >= 2) {
-    mode_lock guard = lock(mode_c<DualHVX>::instance);
-    if (!guard.owns_mode()) return RESULT_NOT_READY;
-    cv::adsp::boxfilter16s<DualHVX>(mode_c<DualHVX>::instance, in, ddepth, kernel_width, kernel_height, normalize,
-                                    ring, out);
-  } else if (reserved >= 1) {
-    mode_lock guard = lock(mode_c<SingleHVX>::instance);
-    if (!guard.owns_mode()) return RESULT_NOT_READY;
-    cv::adsp::boxfilter16s<SingleHVX>(mode_c<SingleHVX>::instance, in, ddepth, kernel_width, kernel_height,
-                                      normalize, ring, out);
-  } else {
-    cv::adsp::boxfilter16s<Scalar>(mode_c<Scalar>::instance, in, ddepth, kernel_width, kernel_height, normalize,
-                                   ring, out);
-  }
-  return RESULT_OK;
+  if (reserved >= 2)
+    return run_checked<cv::adsp::boxfilter16s_kernel, DualHVX>(in, ddepth, kernel_width, kernel_height, normalize,
+                                                               ring, out);
+  if (reserved >= 1)
+    return run_checked<cv::adsp::boxfilter16s_kernel, SingleHVX>(in, ddepth, kernel_width, kernel_height,
+                                                                 normalize, ring, out);
+  return run_checked<cv::adsp::boxfilter16s_kernel, Scalar>(in, ddepth, kernel_width, kernel_height, normalize, ring,
+                                                            out);
 }

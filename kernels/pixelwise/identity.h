@@ -5,6 +5,7 @@
 
 #include "core/hvx_modes.h"
 #include "core/membuf.h"
+#include "core/reach.h"
 #include "core/result.h"
 
 namespace cv {
@@ -12,6 +13,15 @@ namespace adsp {
 
 template <hvx::mode_enum M> struct identity {
   static AEEResult run(hvx::for_mode<M> mode, gen_in input, gen_out output);
+
+  // stride * rows bytes of each buffer, vector-aligned in the vector modes.
+  static hvx::reach reach(const gen_in& input, const gen_out& output) {
+    const int64_t bytes = hvx::sat_mul(input.stride_bytes(), input.rows());
+    return hvx::reach()
+        .refuse_if(input.stride_bytes() < 0 || input.rows() < 0)
+        .bytes(input.buffer, bytes, hvx::mode_align<M>)
+        .bytes(output.buffer, bytes, hvx::mode_align<M>);
+  }
 };
 
 }  // namespace adsp

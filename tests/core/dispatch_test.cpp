@@ -23,6 +23,8 @@ template <mode_enum M> struct probe {
     seen.reserved = scoped_reservation::query_reserved();
     return answer;
   }
+  // The probe's buffers lie outside what it was given when it is asked to answer 14.
+  static hvx::reach reach(int answer) { return hvx::reach().refuse_if(answer == RESULT_BAD_POINTER); }
 };
 
 template <int Allowed> seen_run dispatch(int units, AEEResult* result, int answer = 0) {
@@ -87,6 +89,15 @@ TEST(Ladder, KernelResultPassesThrough) {
   EXPECT_EQ(29, r);
   dispatch<ALL>(0, &r, -2);
   EXPECT_EQ(-2, r);
+}
+
+TEST(Ladder, ReachOutsideTheBuffersIsRefusedBeforeTheKernelRuns) {
+  AEEResult r;
+  for (int units : {0, 1, 4}) {
+    EXPECT_EQ(-1, dispatch<ALL>(units, &r, RESULT_BAD_POINTER).mode) << units << " units";
+    EXPECT_EQ(RESULT_BAD_POINTER, r);
+    EXPECT_EQ(0, test::counters().lock_calls) << "refused before any lock";
+  }
 }
 
 TEST(Ladder, UnitsHeldBeforeTheCallStayHeld) {

@@ -1,0 +1,175 @@
+// The boundary of every exported image function: a call whose buffers hold exactly what
+// the kernel reads and writes succeeds; one byte less, a misaligned vector buffer, or a
+// descriptor that is negative, absurd or overflows answers 14, and no byte of the
+// buffers, nor of the guard bands around them, changes.
+#include <gtest/gtest.h>
+
+#include <climits>
+#include <cstdlib>
+#include <functional>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "remote/corvane.h"
+#include "support/platform.h"
+
+namespace {
+
+constexpr size_t kGuard = 256;  // canary bytes on each side of a buffer
+
+// A buffer of `len` bytes at `misalign` bytes past a 128-byte boundary, inside guard bands.
+class Guarded {
+ public:
+  Guarded(size_t len, size_t misalign) : size_(2 * kGuard + misalign + len) {
+    block_.reset(static_cast<uint8_t*>(std::aligned_alloc(128, (size_ + 127) / 128 * 128)));
+    for (size_t i = 0; i < size_; ++i) block_[i] = uint8_t(i * 131 + 7);
+    record.mem = block_.get() + kGuard + misalign;
+    record.memLen = int(len);
+  }
+  bool untouched() const {
+    for (size_t i = 0; i < size_; ++i)
+      if (block_[i] != uint8_t(i * 131 + 7)) return false;
+    return true;
+  }
+  corvane_mbuf record;
+
+ private:
+  struct free_block {
+    void operator()(uint8_t* p) const { std::free(p); }
+  };
+  std::unique_ptr<uint8_t[], free_block> block_;
+  size_t size_;
+};
+
+using call_fn = std::function<int(const corvane_mbufd*, corvane_mbuf*)>;
+
+struct method_case {
+  std::string name;
+  std::vector<int> units;              // the platform's units in each mode the method runs in
+  std::vector<corvane_mbufd> descs;    // of a call that fits
+  std::vector<int> lengths;            // [bytes] each buffer, exactly its reach
+  std::vector<bool> scalar_reach;      // whether the Scalar variant's reach covers the buffer
+  std::vector<corvane_mbufd (*)(corvane_mbufd)> absurd;  // applied to descs[0]
+  call_fn call;
+};
+
+corvane_mbufd desc(int stride, int cols, int rows, int channels = 1, int depth = 0) {
+  return corvane_mbufd{stride, cols, rows, channels, depth, 0, 0, 0, 0};
+}
+
+// Descriptor faults shared by the methods.
+corvane_mbufd negative_stride(corvane_mbufd d) { return d.stride = -d.stride, d; }
+corvane_mbufd negative_rows(corvane_mbufd d) { return d.rows = -1, d; }
+corvane_mbufd huge_image(corvane_mbufd d) { return d.stride = INT_MAX / 128 * 128, d.rows = INT_MAX, d; }
+corvane_mbufd no_channels(corvane_mbufd d) { return d.channels = 0, d; }
+corvane_mbufd huge_row(corvane_mbufd d) { return d.cols = INT_MAX, d.channels = INT_MAX, d; }
+
+int box(const corvane_mbufd* d, corvane_mbuf* b, int ddepth) {
+  return corvane_boxfilter(&d[0], &b[0], ddepth, 3, 5, 1, &d[1], &b[1], &d[2], &b[2]);
+}
+
+// Sizes chosen so that a row fills its stride in both vector lengths, which makes every
+// byte of the reach count; the box filter (3x5, H = 5) leaves its last 2 output rows
+// unwritten, and its ring holds 2 * 5 rows of two 16-bit (8-bit input) or 32-bit
+// (16-bit input) sums per element.
+std::vector<method_case> cases() {
+  return {
+      {"identity", {0, 1, 4}, {desc(384, 300, 5)}, {1920, 1920}, {true, true},
+       {negative_stride, negative_rows, huge_image},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return corvane_identity(&d[0], &b[0], &b[1]); }},
+      // 9 input vectors: 4 pairs, then the odd one stored at the end of the planes'
+      // 5 whole vectors.
+      {"deinterleave2C", {1, 4}, {desc(192, 96, 3, 2), desc(64, 64, 5)}, {576, 384, 384}, {true, true, true},
+       {negative_stride, negative_rows, huge_image},
+       [](const corvane_mbufd* d, corvane_mbuf* b) {
+         return corvane_deinterleave2C(&d[0], &b[0], &d[1], &b[1], &b[2]);
+       }},
+      {"boxfilter 8-bit", {0, 1, 4}, {desc(256, 256, 9), desc(512, 0, 0), desc(512, 256, 9, 1, 3)},
+       {9 * 256, 10 * 512, 7 * 512}, {true, false, true},
+       {negative_stride, negative_rows, huge_image, no_channels, huge_row},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return box(d, b, 2); }},
+      {"boxfilter 16-bit", {0, 1, 4}, {desc(256, 128, 9, 1, 3), desc(512, 0, 0), desc(512, 128, 9, 1, 4)},
+       {9 * 256, 10 * 512, 7 * 512}, {true, false, true},
+       {negative_stride, negative_rows, huge_image, no_channels, huge_row},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return box(d, b, 4); }},
+  };
+}
+
+// Runs one call with buffer `shrunk` one byte short and buffer `shifted` misaligned
+// (-1: none); the descriptors as given. Returns the result; `untouched` tells whether
+// every guarded byte is as it was.
+int run(const method_case& c, const std::vector<corvane_mbufd>& descs, int shrunk, int shifted, bool* untouched) {
+  std::vector<std::unique_ptr<Guarded>> buffers;
+  std::vector<corvane_mbuf> records;
+  for (size_t i = 0; i < c.lengths.size(); ++i) {
+    const int len = c.lengths[i] - (int(i) == shrunk ? 1 : 0);
+    buffers.push_back(std::make_unique<Guarded>(size_t(len), int(i) == shifted ? 1 : 0));
+    records.push_back(buffers.back()->record);
+  }
+  const int result = c.call(descs.data(), records.data());
+  *untouched = true;
+  for (const auto& b : buffers) *untouched = *untouched && b->untouched();
+  return result;
+}
+
+std::string where(const method_case& c, int units, const std::string& what) {
+  return c.name + ", " + std::to_string(units) + " units, " + what;
+}
+
+TEST(Boundary, ExactReachIsServed) {
+  for (const method_case& c : cases())
+    for (int units : c.units) {
+      test::ScopedUnits scoped(units);
+      bool untouched;
+      EXPECT_EQ(0, run(c, c.descs, -1, -1, &untouched)) << where(c, units, "buffers exactly the reach");
+    }
+}
+
+TEST(Boundary, EachBufferOneByteShortIsRefused) {
+  for (const method_case& c : cases())
+    for (int units : c.units)
+      for (int i = 0; i < int(c.lengths.size()); ++i) {
+        test::ScopedUnits scoped(units);
+        const bool in_reach = units > 0 || c.scalar_reach[size_t(i)];
+        bool untouched;
+        const std::string what = "buffer " + std::to_string(i) + " one byte short";
+        EXPECT_EQ(in_reach ? 14 : 0, run(c, c.descs, i, -1, &untouched)) << where(c, units, what);
+        if (in_reach) {
+          EXPECT_TRUE(untouched) << where(c, units, what);
+        }
+      }
+}
+
+TEST(Boundary, MisalignedVectorBuffersAreRefused) {
+  for (const method_case& c : cases())
+    for (int units : c.units)
+      for (int i = 0; i < int(c.lengths.size()); ++i) {
+        test::ScopedUnits scoped(units);
+        bool untouched;
+        const int result = run(c, c.descs, -1, i, &untouched);
+        const std::string what = "buffer " + std::to_string(i) + " misaligned";
+        if (units == 0) {
+          EXPECT_EQ(0, result) << where(c, units, what) << ": Scalar has no alignment to keep";
+        } else {
+          EXPECT_EQ(14, result) << where(c, units, what);
+          EXPECT_TRUE(untouched) << where(c, units, what);
+        }
+      }
+}
+
+TEST(Boundary, AbsurdDescriptorsAreRefused) {
+  for (const method_case& c : cases())
+    for (int units : c.units)
+      for (size_t f = 0; f < c.absurd.size(); ++f) {
+        test::ScopedUnits scoped(units);
+        std::vector<corvane_mbufd> descs = c.descs;
+        descs[0] = c.absurd[f](descs[0]);
+        bool untouched;
+        const std::string what = "descriptor fault " + std::to_string(f);
+        EXPECT_EQ(14, run(c, descs, -1, -1, &untouched)) << where(c, units, what);
+        EXPECT_TRUE(untouched) << where(c, units, what);
+      }
+}
+
+}  // namespace
