@@ -34,7 +34,11 @@ template <class V> struct SplitBlock {
       v2 = vzero<V>();
     } else {
       v1 = in[0];
-      v2 = vmux(vsetq<SingleHVX>(static_cast<int>(reminder_bytes - kVectorBytes)), V(in[1]), vzero<V>());
+      // A remainder of exactly one vector leaves nothing of in[1] to keep: it is not
+      // loaded, so that the read ends with the input.
+      v2 = reminder_bytes > kVectorBytes
+               ? vmux(vsetq<SingleHVX>(static_cast<int>(reminder_bytes - kVectorBytes)), V(in[1]), vzero<V>())
+               : vzero<V>();
     }
     const auto out = deinterleave<V>(v2, v1);
     *o1 = lo(out);
