@@ -38,7 +38,7 @@ fi
 seconds=${1:-120}
 workers=${2:-1}
 rm -rf "$run" && mkdir -p "$run/corpus" "$run/artifacts"
-cp fuzz/corpus/* "$run/corpus/"
+if [ -d fuzz/corpus ]; then cp fuzz/corpus/* "$run/corpus/"; fi  # the seed corpus, when there is one
 options=("${common[@]}" -max_total_time="$seconds" -artifact_prefix="$run/artifacts/")
 if [ "$workers" -gt 1 ]; then options+=(-fork="$workers"); fi
 
