@@ -293,7 +293,6 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     }
   }
 
-  if (number == 40 && (load_u32(prim.data() + 12) > (1u << 16))) return 0;  // TEMP
   // One call in eight: damage one thing.
   int method_field = number < kFirstEscapedMethod ? number : kFirstEscapedMethod;
   bool plan_kept = true;  // false: the entry reads the buffers by another method's plan
