@@ -377,7 +377,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
 
   const uint32_t sc = REMOTE_SCALARS_MAKE(method_field, n_in, n_out);
   if (getenv("CORVANE_FUZZ_TRACE") != nullptr) trace(number, sc, prim, bufs);
-  const int result = corvane_skel_invoke(sc, total > 0 ? pra.data() : pra.data() /*TEMP*/);
+  const int result = corvane_skel_invoke(sc, pra.data());
 
   for (buffer& b : bufs) ASAN_UNPOISON_MEMORY_REGION(b.p, size_t(b.len));
   for (const buffer& b : bufs) {
