@@ -116,8 +116,9 @@ int unmarshal(const method_plan& p, uint32_t sc, remote_arg* pra, arg_slot* slot
   // Output buffers are found from the counts of the call, so they must also lie inside it.
   if (n_in + uint32_t(p.out_bufs) > total) return kBadLength;
 
-  remote_arg* in = pra + 1;
-  remote_arg* out = pra + n_in;
+  // A call without buffers may come with no array at all.
+  remote_arg* in = total > 0 ? pra + 1 : nullptr;
+  remote_arg* out = total > 0 ? pra + n_in : nullptr;
   const uint8_t* prim = nullptr;
   if (p.has_prim_in) {
     if (pra[0].buf.nLen < size_t(p.base + p.prim_in_size)) return kBadLength;

@@ -146,6 +146,7 @@ CORVANE_BOX_FLAT void filter_rows_of(gen_in& _input, gen_out& _buffer, gen_out& 
   const int R = H / 2;
   const int channels = Channels != 0 ? Channels : input.channels();
   const int vectors_per_row = (input.cols() * channels + pixels_per_vector - 1) / pixels_per_vector;
+  if (vectors_per_row <= 0) return;  // rows of no width: nothing to read or write, however many
   const size_t input_stride = input.stride_vectors();                                  // [vectors]
   const size_t ring_pitch = static_cast<unsigned>(ring.stride_bytes()) / (2 * N) * 2;  // [vectors], whole pairs
   const size_t output_stride = output.stride_vectors();                                // [vectors]

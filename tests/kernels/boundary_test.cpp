@@ -180,3 +180,18 @@ TEST(Boundary, AbsurdDescriptorsAreRefused) {
 }
 
 }  // namespace
+
+namespace {
+
+// Rows of no width touch nothing, so the boundary lets them through: the filter must not
+// then walk two billion empty rows.
+TEST(Boundary, RowsOfNoWidthEndAtOnce) {
+  for (int units : {1, 4}) {
+    test::ScopedUnits scoped(units);
+    const corvane_mbufd in{0, 0, INT_MAX, 4, 0, 0, 0, 0, 0}, other{0, 0, 0, 1, 0, 0, 0, 0, 0};
+    corvane_mbuf empty{nullptr, 0};
+    EXPECT_EQ(0, corvane_boxfilter(&in, &empty, 0, 5, 3, 1, &other, &empty, &other, &empty)) << units << " units";
+  }
+}
+
+}  // namespace
