@@ -249,7 +249,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     if (q.k == kind::mbufd) {
       corvane_mbufd& d = descs[n_descs];
       d = make_descriptor(in, n_descs > 0 ? &descs[0] : nullptr);
-      if (number == method::boxfilter && n_descs > 0) shape_boxfilter(in, info.params.items[i].name, descs[0], scalars, d);
+      if (number == method::boxfilter && n_descs > 0)
+        shape_boxfilter(in, info.params.items[i].name, descs[0], scalars, d);
       const int32_t words[9] = {d.stride, d.cols, d.rows, d.channels, d.depth,
                                 d.border_left, d.border_right, d.border_top, d.border_bottom};
       for (int w = 0; w < 9; ++w) store_le(field + 4 * w, uint32_t(words[w]), 4);
@@ -305,7 +306,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
         for (int i = 0; i < plan.count; ++i) {
           const param_plan& q = plan.params[i];
           if (q.k == kind::mbufd && damage == 1) for (int w = 0; w < 9; ++w) offsets.push_back(q.in_off + 4 * w);
-          if (is_sequence(q.k) && damage == 0) offsets.push_back(q.in_off + (q.d == dir::inrout ? 4 * in.ConsumeIntegralInRange(0, 1) : 0));
+          if (is_sequence(q.k) && damage == 0)
+            offsets.push_back(q.in_off + (q.d == dir::inrout ? 4 * in.ConsumeIntegralInRange(0, 1) : 0));
         }
         if (offsets.empty()) break;
         uint8_t* word = prim.data() + offsets[in.ConsumeIntegralInRange<size_t>(0, offsets.size() - 1)];
@@ -377,7 +379,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
 
   const uint32_t sc = REMOTE_SCALARS_MAKE(method_field, n_in, n_out);
   if (getenv("CORVANE_FUZZ_TRACE") != nullptr) trace(number, sc, prim, bufs);
-  const int result = corvane_skel_invoke(sc, pra.data());
+  const int result = corvane_skel_invoke(sc, total > 0 ? pra.data() : nullptr);
 
   for (buffer& b : bufs) ASAN_UNPOISON_MEMORY_REGION(b.p, size_t(b.len));
   for (const buffer& b : bufs) {
