@@ -32,6 +32,12 @@ inline int64_t sat_mul(int64_t a, int64_t b) {
 // ceil(a / b) for a >= 0, b > 0.
 inline int64_t div_up(int64_t a, int64_t b) { return a / b + (a % b != 0 ? 1 : 0); }
 
+// The bytes that a view's rows span, stride * rows; -1, which no region fits, when
+// either is negative.
+inline int64_t image_bytes(const InOutPtrBase& view) {
+  return view.stride_bytes() < 0 || view.rows() < 0 ? -1 : sat_mul(view.stride_bytes(), view.rows());
+}
+
 // The alignment of a mode's vector loads and stores; 1 in Scalar.
 template <mode_enum M> constexpr int64_t mode_align = M == Scalar ? 1 : static_cast<int64_t>(mode_vector_bytes<M>);
 
@@ -87,9 +93,6 @@ class reach {
     }
     return true;
   }
-
-  int count() const { return _count; }
-  const region& operator[](int i) const { return _regions[i]; }
 
  private:
   region _regions[kMaxRegions] = {};

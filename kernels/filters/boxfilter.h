@@ -47,7 +47,7 @@ hvx::reach reach_of(const family& f, const gen_in& input, int32_t ddepth, int32_
   const int64_t widest_tap = sat_mul(input.channels(), E * (kernel_width / 2 > 0 ? kernel_width / 2 : 1));
   r.refuse_if(input.stride_bytes() < 0 || input.cols() < 0 || input.rows() < 0 || input.channels() <= 0 ||
               widest_tap > INT32_MAX || output.stride_bytes() < 0);
-  if (M == hvx::Scalar) {
+  if constexpr (M == hvx::Scalar) {
     return r.image_rows(input, rows, sat_mul(elements, E)).image_rows(output, out_rows, sat_mul(elements, out_bytes));
   }
   const int64_t V = hvx::div_up(sat_mul(elements, E), N);

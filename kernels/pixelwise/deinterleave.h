@@ -21,15 +21,13 @@ void deinterleave2C(gen_in& _inp, GenInOutArray<false, 2>& _outputs);
 inline reach deinterleave2C_reach(const gen_in& input, const GenInOutArray<false, 2>& outputs) {
   constexpr int64_t N = mode_align<SingleHVX>;
   if (input.depth() < 0 || input.depth() > 5) return reach();
-  const int64_t in_bytes = sat_mul(input.stride_bytes(), input.rows());
-  const int64_t plane_vectors = sat_mul(outputs[0].stride_bytes(), outputs[0].rows()) / N;
+  const int64_t in_bytes = image_bytes(input), plane_span = image_bytes(outputs[0]);
+  if (in_bytes < 0 || plane_span < 0) return reach().refuse_if(true);
   const int64_t whole = in_bytes / N;
   const bool tail = whole % 2 == 1 || in_bytes % N != 0;
-  int64_t plane_bytes = whole / 2 * N;
-  if (tail && sat_mul(plane_vectors + 1, N) > plane_bytes) plane_bytes = sat_mul(plane_vectors + 1, N);
+  const int64_t pairs_bytes = whole / 2 * N;
+  const int64_t plane_bytes = tail ? nstd::max(pairs_bytes, sat_mul(plane_span / N + 1, N)) : pairs_bytes;
   return reach()
-      .refuse_if(input.stride_bytes() < 0 || input.rows() < 0 || outputs[0].stride_bytes() < 0 ||
-                 outputs[0].rows() < 0)
       .bytes(input.buffer, sat_mul(div_up(in_bytes, N), N), N)
       .bytes(outputs[0].buffer, plane_bytes, N)
       .bytes(outputs[1].buffer, plane_bytes, N);

@@ -16,9 +16,8 @@ template <hvx::mode_enum M> struct identity {
 
   // stride * rows bytes of each buffer, vector-aligned in the vector modes.
   static hvx::reach reach(const gen_in& input, const gen_out& output) {
-    const int64_t bytes = hvx::sat_mul(input.stride_bytes(), input.rows());
+    const int64_t bytes = hvx::image_bytes(input);
     return hvx::reach()
-        .refuse_if(input.stride_bytes() < 0 || input.rows() < 0)
         .bytes(input.buffer, bytes, hvx::mode_align<M>)
         .bytes(output.buffer, bytes, hvx::mode_align<M>);
   }

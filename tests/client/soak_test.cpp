@@ -34,8 +34,8 @@ struct soak_call {
   }
 };
 
-Image random_image(int cols, int rows, int channels, int32_t depth, uint32_t seed, int stride = 0) {
-  Image im(cols, rows, channels, depth, stride);
+Image random_image(int cols, int rows, int channels, int32_t depth, uint32_t seed) {
+  Image im(cols, rows, channels, depth);
   im.fill_random(seed);
   return im;
 }
