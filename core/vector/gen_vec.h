@@ -5,8 +5,10 @@
 #define CORVANE_CORE_VECTOR_GEN_VEC_H
 
 #include "core/hvx_modes.h"
+#include "core/vector/isa.h"
 
 namespace hvx {
+CORVANE_ISA_BEGIN
 
 // The raw register of each vector length: what the backends compute on.
 typedef int32_t raw_vec64 __attribute__((vector_size(64), aligned(64)));
@@ -29,6 +31,7 @@ template <mode_enum M> struct gen_vec {
 static_assert(sizeof(gen_vec<SingleHVX>) == 64 && alignof(gen_vec<SingleHVX>) == 64, "64-byte vector");
 static_assert(sizeof(gen_vec<DualHVX>) == 128 && alignof(gen_vec<DualHVX>) == 128, "128-byte vector");
 
+CORVANE_ISA_END
 }  // namespace hvx
 
 #endif

@@ -22,6 +22,7 @@
 #endif
 
 namespace hvx {
+CORVANE_ISA_BEGIN
 
 // Predicate operators: the same as pred_or, pred_and, pred_xor (both operands always
 // evaluated); operator! is a member and flips the sense.
@@ -35,6 +36,7 @@ template <mode_enum M, bool NA, bool NB> inline gen_pred_vec<M> operator^(gen_pr
   return pred_xor(a, b);
 }
 
+CORVANE_ISA_END
 }  // namespace hvx
 
 #endif

@@ -21,6 +21,7 @@
 #include "core/vector/gen_vec.h"
 
 namespace hvx {
+CORVANE_ISA_BEGIN
 
 // ---- lanes -----------------------------------------------------------------------------
 
@@ -262,6 +263,7 @@ template <class To, class From> inline To vcast(const From& v) {
   return r;
 }
 
+CORVANE_ISA_END
 }  // namespace hvx
 
 #endif

@@ -12,6 +12,7 @@
 #include "core/membuf.h"
 #include "core/reach.h"
 #include "core/result.h"
+#include "core/vector/isa.h"
 #include "kernels/filters/boxfilter_family.h"
 
 namespace cv {
@@ -66,7 +67,7 @@ hvx::reach reach_of(const family& f, const gen_in& input, int32_t ddepth, int32_
 
 // 8-bit input. Looks the member up and runs it: 0, or 4 for arguments outside the table,
 // with nothing touched. Scalar: 0, nothing touched.
-template <hvx::mode_enum M> struct boxfilter {
+template <hvx::mode_enum M, int Isa = hvx::this_isa> struct boxfilter {
   static AEEResult run(hvx::for_mode<M> mode, gen_in& _input, int32_t ddepth, int32_t kernel_width,
                        int32_t kernel_height, uint8_t normalize, gen_out& _buffer, gen_out& _output);
   static hvx::reach reach(const gen_in& _input, int32_t ddepth, int32_t kernel_width, int32_t kernel_height,
@@ -79,7 +80,7 @@ AEEResult boxfilter<hvx::Scalar>::run(hvx::for_mode<hvx::Scalar>, gen_in&, int32
                                       gen_out&, gen_out&);
 
 // 16-bit input, the same through the 16-bit table; arguments outside it do nothing.
-template <hvx::mode_enum M>
+template <hvx::mode_enum M, int Isa = hvx::this_isa>
 void boxfilter16s(hvx::for_mode<M> mode, gen_in& _input, int32_t ddepth, int32_t kernel_width, int32_t kernel_height,
                   uint8_t normalize, gen_out& _buffer, gen_out& _output);
 template <>
@@ -87,10 +88,10 @@ void boxfilter16s<hvx::Scalar>(hvx::for_mode<hvx::Scalar>, gen_in&, int32_t, int
                                gen_out&);
 
 // boxfilter16s as a kernel of the mode ladder: its reach, and a run that answers 0.
-template <hvx::mode_enum M> struct boxfilter16s_kernel {
+template <hvx::mode_enum M, int Isa = hvx::this_isa> struct boxfilter16s_kernel {
   static AEEResult run(hvx::for_mode<M> mode, gen_in& _input, int32_t ddepth, int32_t kernel_width,
                        int32_t kernel_height, uint8_t normalize, gen_out& _buffer, gen_out& _output) {
-    boxfilter16s<M>(mode, _input, ddepth, kernel_width, kernel_height, normalize, _buffer, _output);
+    boxfilter16s<M, Isa>(mode, _input, ddepth, kernel_width, kernel_height, normalize, _buffer, _output);
     return hvx::RESULT_OK;
   }
   static hvx::reach reach(const gen_in& _input, int32_t ddepth, int32_t kernel_width, int32_t kernel_height,

@@ -239,8 +239,8 @@ constexpr nstd::array<box_routine<M>, box::k16s.members()> boxfilter16sHvxFuncTa
 
 }  // namespace
 
-template <hvx::mode_enum M>
-AEEResult boxfilter<M>::run(hvx::for_mode<M> mode, gen_in& _input, int32_t ddepth, int32_t kernel_width,
+template <hvx::mode_enum M, int Isa>
+AEEResult boxfilter<M, Isa>::run(hvx::for_mode<M> mode, gen_in& _input, int32_t ddepth, int32_t kernel_width,
                             int32_t kernel_height, uint8_t normalize, gen_out& _buffer, gen_out& _output) {
   const int index = box::k8u.index_of(kernel_width, kernel_height, ddepth, normalize != 0);
   if (index < 0) return hvx::RESULT_UNSUPPORTED;
@@ -248,7 +248,7 @@ AEEResult boxfilter<M>::run(hvx::for_mode<M> mode, gen_in& _input, int32_t ddept
   return hvx::RESULT_OK;
 }
 
-template <hvx::mode_enum M>
+template <hvx::mode_enum M, int Isa>
 void boxfilter16s(hvx::for_mode<M> mode, gen_in& _input, int32_t ddepth, int32_t kernel_width, int32_t kernel_height,
                   uint8_t normalize, gen_out& _buffer, gen_out& _output) {
   const int index = box::k16s.index_of(kernel_width, kernel_height, ddepth, normalize != 0);

@@ -5,13 +5,14 @@
 
 #include "core/membuf.h"
 #include "core/reach.h"
+#include "core/vector/isa.h"
 
 namespace hvx {
 namespace single {
 
 // Channel 0 of each interleaved pair goes to the first plane, channel 1 to the second.
 // Whole vectors are stored, also for the tail, with zeros past it.
-void deinterleave2C(gen_in& _inp, GenInOutArray<false, 2>& _outputs);
+template <int Isa = this_isa> void deinterleave2C(gen_in& _inp, GenInOutArray<false, 2>& _outputs);
 
 // The split reads the input's stride * rows bytes as whole vectors, its last partial
 // vector too. Each plane gets one vector per input pair from its start, and, when the

@@ -109,12 +109,14 @@ class Loop : public cv::adsp::ParallelLoop {
 
 }  // namespace
 
-void deinterleave2C(gen_in& _inp, GenInOutArray<false, 2>& _outputs) {
+template <int Isa> void deinterleave2C(gen_in& _inp, GenInOutArray<false, 2>& _outputs) {
   in<vec> input(_inp);
   Loop::outputs_type outs(_outputs);
   Loop loop(input, outs);
   (void)loop.run(0);  // a failed run (unknown depth) writes nothing and is not reported
 }
+
+template void deinterleave2C<this_isa>(gen_in&, GenInOutArray<false, 2>&);
 
 }  // namespace single
 }  // namespace hvx

@@ -7,11 +7,12 @@
 #include "core/membuf.h"
 #include "core/reach.h"
 #include "core/result.h"
+#include "core/vector/isa.h"
 
 namespace cv {
 namespace adsp {
 
-template <hvx::mode_enum M> struct identity {
+template <hvx::mode_enum M, int Isa = hvx::this_isa> struct identity {
   static AEEResult run(hvx::for_mode<M> mode, gen_in input, gen_out output);
 
   // stride * rows bytes of each buffer, vector-aligned in the vector modes.

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include "core/dispatch.h"
+#include "host_isa.h"
 #include "support/platform.h"
 
 namespace {
@@ -13,12 +14,14 @@ struct seen_run {
   int mode = -1;          // the variant that ran, -1 if none
   int thread_mode = -1;   // the calling thread's record during the run
   int reserved = -1;      // units held during the run
+  int isa = -1;           // the level of vector code that ran
 };
 seen_run seen;
 
-template <mode_enum M> struct probe {
+template <mode_enum M, int Isa = 0> struct probe {
   static AEEResult run(for_mode<M> mode, int answer) {
     seen.mode = M;
+    seen.isa = Isa;
     seen.thread_mode = mode.is_current() ? M : get_thread_mode();
     seen.reserved = scoped_reservation::query_reserved();
     return answer;
@@ -51,6 +54,8 @@ TEST(Ladder, AllModesFollowTheUnits) {
     EXPECT_EQ(DualHVX, s.mode) << units << " units";
     EXPECT_EQ(DualHVX, s.thread_mode);
   }
+  EXPECT_EQ(max_isa > 0 ? corvane_host_isa() : 0, s.isa) << "the vector modes run the host's level";
+  EXPECT_EQ(0, dispatch<ALL>(0, &r).isa) << "the scalar variant is compiled once";
   EXPECT_EQ(0, scoped_reservation::query_reserved()) << "the ladder gave its units back";
   EXPECT_EQ(Scalar, get_thread_mode());
 }

@@ -21,6 +21,7 @@
 #include "core/vector/portable/shift.h"
 
 namespace hvx {
+CORVANE_ISA_BEGIN
 namespace hvx_backend {
 
 typedef int hv_t __attribute__((vector_size(__HVX_LENGTH__)));
@@ -605,6 +606,7 @@ template <mode_enum M> inline qvec_t<M> vsetq(int rt) {
 
 #undef CORVANE_HVX_BHW
 
+CORVANE_ISA_END
 }  // namespace hvx
 
 #endif

@@ -5,16 +5,18 @@
 #define CORVANE_CORE_VECTOR_PORTABLE_ARITH_H
 
 #include "core/vector/portable/lanes.h"
+#include "core/vector/portable/x86_chunk.h"
 
 namespace hvx {
+CORVANE_ISA_BEGIN
 CORVANE_PORTABLE_INLINE namespace portable {
 
 namespace impl {
 template <class L> inline chunk<L> add_sat(chunk<L> x, chunk<L> y) {
 #if CORVANE_GCC_SSE2
-  if constexpr (nstd::is_same_c<L, uint8_t>::value) return (chunk<L>)__builtin_ia32_paddusb128((sse_bytes)x, (sse_bytes)y);
-  if constexpr (nstd::is_same_c<L, uint16_t>::value) return (chunk<L>)__builtin_ia32_paddusw128((sse_halves)x, (sse_halves)y);
-  if constexpr (nstd::is_same_c<L, int16_t>::value) return (chunk<L>)__builtin_ia32_paddsw128((sse_halves)x, (sse_halves)y);
+  if constexpr (nstd::is_same_c<L, uint8_t>::value) return (chunk<L>)x86::adds_u8((x86::bytes)x, (x86::bytes)y);
+  if constexpr (nstd::is_same_c<L, uint16_t>::value) return (chunk<L>)x86::adds_u16((x86::halves)x, (x86::halves)y);
+  if constexpr (nstd::is_same_c<L, int16_t>::value) return (chunk<L>)x86::adds_i16((x86::halves)x, (x86::halves)y);
 #endif
   if constexpr (lane_traits<L>::is_signed) {
     // Overflow where both operands differ in sign from the wrapped sum; the limit then
@@ -30,9 +32,9 @@ template <class L> inline chunk<L> add_sat(chunk<L> x, chunk<L> y) {
 }
 template <class L> inline chunk<L> sub_sat(chunk<L> x, chunk<L> y) {
 #if CORVANE_GCC_SSE2
-  if constexpr (nstd::is_same_c<L, uint8_t>::value) return (chunk<L>)__builtin_ia32_psubusb128((sse_bytes)x, (sse_bytes)y);
-  if constexpr (nstd::is_same_c<L, uint16_t>::value) return (chunk<L>)__builtin_ia32_psubusw128((sse_halves)x, (sse_halves)y);
-  if constexpr (nstd::is_same_c<L, int16_t>::value) return (chunk<L>)__builtin_ia32_psubsw128((sse_halves)x, (sse_halves)y);
+  if constexpr (nstd::is_same_c<L, uint8_t>::value) return (chunk<L>)x86::subs_u8((x86::bytes)x, (x86::bytes)y);
+  if constexpr (nstd::is_same_c<L, uint16_t>::value) return (chunk<L>)x86::subs_u16((x86::halves)x, (x86::halves)y);
+  if constexpr (nstd::is_same_c<L, int16_t>::value) return (chunk<L>)x86::subs_i16((x86::halves)x, (x86::halves)y);
 #endif
   if constexpr (lane_traits<L>::is_signed) {
     constexpr int top = lane_traits<L>::bits - 1;
@@ -137,6 +139,7 @@ template <class V> inline if_lanes<V, uint8_t, uint16_t, int16_t, int32_t> vmin(
 }
 
 }  // namespace portable
+CORVANE_ISA_END
 }  // namespace hvx
 
 #endif

@@ -1,10 +1,11 @@
-// Building blocks of the portable backend: 16-byte chunks of a vector and the few lane
-// formulas that several operations share.
+// Building blocks of the portable backend: chunks of a vector, as wide as the target's
+// registers, and the few lane formulas that several operations share.
 //
-// Why chunks: GCC lowers a 64- or 128-byte vector expression to 16-byte pieces but
-// assembles the result through the stack, which doubles the stores of every operation.
-// Working on the vector one 16-byte chunk at a time, fully unrolled, keeps the pieces in
-// registers on x86-64 (SSE2) and costs nothing where the compiler does better.
+// Why chunks: GCC lowers a 64- or 128-byte vector expression to register-sized pieces
+// but assembles the result through the stack, which doubles the stores of every
+// operation. Working on the vector one chunk at a time, fully unrolled, keeps the pieces
+// in registers on x86-64 and costs nothing where the compiler does better. A chunk is
+// 16 bytes at the baseline (SSE2), 32 with AVX2 and 64 with AVX-512 (core/vector/isa.h).
 // Operations whose lanes do not move between chunks are written on chunks; the ones
 // that move bytes across the vector are plain lane loops.
 #ifndef CORVANE_CORE_VECTOR_PORTABLE_LANES_H
@@ -22,9 +23,9 @@
 #define CORVANE_PORTABLE_INLINE inline
 #endif
 
-// GCC does not turn the saturating formulas into the SSE2 instructions that compute
-// exactly them (paddusb and kin); its builtins name them without a header. Clang finds
-// the instructions from the formulas itself.
+// GCC does not turn the saturating formulas into the x86 instructions that compute
+// exactly them (paddusb and kin); its builtins name them without a header, one per
+// register width (x86_chunk.h). Clang finds the instructions from the formulas itself.
 #if defined(__SSE2__) && defined(__GNUC__) && !defined(__clang__)
 #define CORVANE_GCC_SSE2 1
 #else
@@ -32,14 +33,10 @@
 #endif
 
 namespace hvx {
+CORVANE_ISA_BEGIN
 namespace portable_lanes {
 
-#if CORVANE_GCC_SSE2
-typedef char sse_bytes __attribute__((vector_size(16)));
-typedef short sse_halves __attribute__((vector_size(16)));
-#endif
-
-constexpr size_t chunk_bytes = 16;
+constexpr size_t chunk_bytes = CORVANE_CHUNK_BYTES;
 template <class L> using chunk = raw_lanes<L, chunk_bytes>;
 template <class L> using uchunk = chunk<typename lane_traits<L>::unsigned_t>;
 template <class L> using schunk = chunk<typename lane_traits<L>::signed_t>;
@@ -161,6 +158,7 @@ template <class V> constexpr bool is_int_lane = lane_is_one_of<typename V::lane_
 CORVANE_PORTABLE_INLINE namespace portable {
 using namespace portable_lanes;
 }  // namespace portable
+CORVANE_ISA_END
 }  // namespace hvx
 
 #endif

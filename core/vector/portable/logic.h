@@ -7,6 +7,7 @@
 #include "core/vector/portable/lanes.h"
 
 namespace hvx {
+CORVANE_ISA_BEGIN
 CORVANE_PORTABLE_INLINE namespace portable {
 
 namespace impl {
@@ -105,6 +106,7 @@ template <mode_enum M> inline qvec_t<M> vsetq(int rt) {
 }
 
 }  // namespace portable
+CORVANE_ISA_END
 }  // namespace hvx
 
 #endif

@@ -6,26 +6,40 @@
 #define CORVANE_CORE_VECTOR_PORTABLE_MOVE_H
 
 #include "core/vector/portable/lanes.h"
+#include "core/vector/portable/x86_chunk.h"
 
 namespace hvx {
+CORVANE_ISA_BEGIN
 CORVANE_PORTABLE_INLINE namespace portable {
 
 namespace impl {
 #if CORVANE_GCC_SSE2 && defined(__OPTIMIZE__)
-typedef long long sse_quads __attribute__((vector_size(16)));
-// align_bytes for a shift known when compiling (0 < s mod 16, s < N): each chunk of the
-// result is two neighbouring chunks of the run joined by whole-register byte shifts,
-// whose counts are immediates; no round trip through memory.
+// Bytes r .. r + chunk_bytes of the chunks a, b laid end to end (0 < r < chunk_bytes).
+__attribute__((always_inline)) inline x86::bytes join_chunks(x86::bytes a, x86::bytes b, size_t r) {
+#if CORVANE_CHUNK_BYTES == 16
+  typedef long long quads __attribute__((vector_size(16)));
+  return (x86::bytes)(__builtin_ia32_psrldqi128((quads)a, static_cast<int>(8 * r)) |
+                      __builtin_ia32_pslldqi128((quads)b, static_cast<int>(8 * (chunk_bytes - r))));
+#else
+  // A constant two-register shuffle: GCC picks the instructions (vpalignr and a lane
+  // permute with AVX2, a word permute and byte shuffles with AVX-512).
+  x86::bytes m;
+  for (size_t i = 0; i < chunk_bytes; ++i) m[i] = static_cast<char>(i + r);
+  return __builtin_shuffle(a, b, m);
+#endif
+}
+// align_bytes for a shift known when compiling (0 < s mod chunk_bytes, s < N): each chunk
+// of the result is two neighbouring chunks of the run joined, in registers; no round
+// trip through memory.
 template <class V> __attribute__((always_inline)) inline V align_bytes_fixed(const V& u, const V& v, size_t s) {
   constexpr size_t n = sizeof(V) / chunk_bytes;
   const size_t q = s / chunk_bytes, r = s % chunk_bytes;
   V out;
   for_chunks<sizeof(V)>([&](size_t c) {
     const size_t k = c + q;  // chunks k and k + 1 of the run v, u
-    const sse_quads a = k < n ? ld<long long>(v, k) : ld<long long>(u, k - n);
-    const sse_quads b = k + 1 < n ? ld<long long>(v, k + 1) : ld<long long>(u, k + 1 - n);
-    st(out, c, __builtin_ia32_psrldqi128(a, static_cast<int>(8 * r)) |
-                   __builtin_ia32_pslldqi128(b, static_cast<int>(8 * (chunk_bytes - r))));
+    const x86::bytes a = k < n ? ld<char>(v, k) : ld<char>(u, k - n);
+    const x86::bytes b = k + 1 < n ? ld<char>(v, k + 1) : ld<char>(u, k + 1 - n);
+    st(out, c, join_chunks(a, b, r));
   });
   return out;
 }
@@ -36,7 +50,7 @@ template <class V> inline V align_bytes(const V& u, const V& v, size_t s) {
 #if CORVANE_GCC_SSE2 && defined(__OPTIMIZE__)
   if (__builtin_constant_p(s) && s % chunk_bytes != 0 && s < sizeof(V)) return align_bytes_fixed(u, v, s);
 #endif
-  alignas(16) uint8_t cat[2 * sizeof(V)];
+  alignas(chunk_bytes) uint8_t cat[2 * sizeof(V)];
   __builtin_memcpy(cat, &v, sizeof(V));
   __builtin_memcpy(cat + sizeof(V), &u, sizeof(V));
   V r;
@@ -154,6 +168,7 @@ inline nstd::on_if_t<lane_is_one_of<typename if_plain<V>::lane_t, int16_t, int32
 }
 
 }  // namespace portable
+CORVANE_ISA_END
 }  // namespace hvx
 
 #endif

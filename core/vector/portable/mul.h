@@ -6,15 +6,17 @@
 #define CORVANE_CORE_VECTOR_PORTABLE_MUL_H
 
 #include "core/vector/portable/lanes.h"
+#include "core/vector/portable/x86_chunk.h"
 
 namespace hvx {
+CORVANE_ISA_BEGIN
 CORVANE_PORTABLE_INLINE namespace portable {
 
 namespace impl {
 
 // A chunk of lanes L whose lane j holds lane j mod n of the scalar word.
 template <class L, class S> inline chunk<L> factor_chunk(S rt) {
-  chunk<L> f;
+  chunk<L> f = {};
   for (int j = 0; j < static_cast<int>(chunk_bytes / sizeof(L)); ++j) f[j] = static_cast<L>(rt[j % S::lanes]);
   return f;
 }
@@ -51,11 +53,11 @@ template <class V> inline widened<if_lanes<V, int16_t>> vmpy(V u, vi16x2 rt) {
   const int32_t f0 = rt[0], f1 = rt[1];
 #if CORVANE_GCC_SSE2
   // pmaddwd against the half-word pairs (f0, 0) and (0, f1): one exact product per word.
-  const sse_halves fe = (sse_halves)splat_lanes<int32_t>(static_cast<int32_t>(static_cast<uint16_t>(f0)));
-  const sse_halves fo = (sse_halves)splat_lanes<int32_t>(static_cast<int32_t>(static_cast<uint32_t>(static_cast<uint16_t>(f1)) << 16));
+  const x86::halves fe = (x86::halves)splat_lanes<int32_t>(static_cast<int32_t>(static_cast<uint16_t>(f0)));
+  const x86::halves fo = (x86::halves)splat_lanes<int32_t>(static_cast<int32_t>(static_cast<uint32_t>(static_cast<uint16_t>(f1)) << 16));
   return map_even_odd<int32_t, widened<V>>(
-      [fe](chunk<int32_t> a) { return (chunk<int32_t>)__builtin_ia32_pmaddwd128((sse_halves)a, fe); },
-      [fo](chunk<int32_t> a) { return (chunk<int32_t>)__builtin_ia32_pmaddwd128((sse_halves)a, fo); }, u);
+      [fe](chunk<int32_t> a) { return (chunk<int32_t>)x86::madd_i16((x86::halves)a, fe); },
+      [fo](chunk<int32_t> a) { return (chunk<int32_t>)x86::madd_i16((x86::halves)a, fo); }, u);
 #endif
   return map_even_odd<int32_t, widened<V>>(
       [f0](chunk<int32_t> a) { return mul_wrap<int32_t>(even_lanes<int32_t>(a), splat_lanes<int32_t>(f0)); },
@@ -219,6 +221,7 @@ inline nstd::on_if_t<lane_is_one_of<typename if_plain<V>::lane_t, uint8_t>, R> v
 }
 
 }  // namespace portable
+CORVANE_ISA_END
 }  // namespace hvx
 
 #endif

@@ -6,6 +6,7 @@
 #include "core/vector/portable/lanes.h"
 
 namespace hvx {
+CORVANE_ISA_BEGIN
 CORVANE_PORTABLE_INLINE namespace portable {
 
 // vshuffe: r[2i] = v[2i], r[2i+1] = u[2i]; 8- and 16-bit lanes.  HVX: vshuffe(Vu,Vv)
@@ -155,6 +156,7 @@ template <class V> inline if_plain<V> vdelta(V u, V v) { return impl::delta_netw
 template <class V> inline if_plain<V> vrdelta(V u, V v) { return impl::delta_network(u, v, true); }
 
 }  // namespace portable
+CORVANE_ISA_END
 }  // namespace hvx
 
 #endif

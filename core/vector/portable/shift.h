@@ -8,6 +8,7 @@
 #include "core/vector/portable/lanes.h"
 
 namespace hvx {
+CORVANE_ISA_BEGIN
 CORVANE_PORTABLE_INLINE namespace portable {
 
 // vasr: r[i] = u[i] >> (rt mod bits), arithmetic; i16, i32 lanes.  HVX: vasr(Vu,Rt)
@@ -114,6 +115,7 @@ inline nstd::on_if_t<lane_is_one_of<typename if_plain<V>::lane_t, uint16_t>, R> 
 }
 
 }  // namespace portable
+CORVANE_ISA_END
 }  // namespace hvx
 
 #endif
