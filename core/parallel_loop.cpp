@@ -26,11 +26,21 @@ template <class Loop> void init_info(callback_info<Loop>& info, Loop* loop, unsi
   dspCV_worker_pool_synctoken_init(&info.token, threads);
 }
 
-// Takes job numbers until body says this worker is done.
+// Job numbers a worker claims at once after its first: consecutive numbers, run in order,
+// so that small jobs do not queue on the one counter.
+constexpr unsigned kJobsPerClaim = 4;
+
+// Takes job numbers until body says this worker is done. The first claim is of one
+// number, so that a body that ends at once sees one number per worker and the counter
+// ends at the team size; a worker told to stop leaves the rest of its claim unseen, all
+// of them past the end of the work.
 template <class Loop> void run_jobs(callback_info<Loop>& info, unsigned worker_id) {
+  unsigned claim = 1;
   for (;;) {
-    const unsigned job_id = dspCV_atomic_inc_return(&info.jobCount) - 1;
-    if (info.loop->body(worker_id, job_id)) break;
+    const unsigned first = __atomic_fetch_add(&info.jobCount, claim, __ATOMIC_SEQ_CST);
+    for (unsigned job_id = first; job_id != first + claim; ++job_id)
+      if (info.loop->body(worker_id, job_id)) return;
+    claim = kJobsPerClaim;
   }
 }
 

@@ -7,7 +7,13 @@
 
 namespace {
 
-constexpr int kPoolThreads = 4;
+// As many threads as the machine runs at once, up to the 4 workers a team can have, so
+// that a team on a small host takes turns instead of preempting each other; never fewer
+// than two, so that the two workers of a job that meet at a barrier both run.
+int pool_threads() {
+  const int n = sim::hardware_threads();
+  return n < 2 ? 2 : n > 4 ? 4 : n;
+}
 constexpr unsigned kQueueJobs = 64;
 
 struct job_queue {
@@ -63,7 +69,7 @@ int dspCV_worker_pool_submit(dspCV_worker_job_t job) {
   }
   if (start) {  // outside the lock: a new thread may need the platform at once
     int started = 0;
-    for (int i = 0; i < kPoolThreads; ++i) started += sim::start_thread(pool_thread, nullptr) ? 1 : 0;
+    for (int i = 0, n = pool_threads(); i < n; ++i) started += sim::start_thread(pool_thread, nullptr) ? 1 : 0;
     sim::guard g;
     queue.threads = started;
     queue.phase = 2;

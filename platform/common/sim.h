@@ -46,6 +46,7 @@ const char* env(const char* name);  // start-up configuration, null if unset
 void write_log(const char* text, size_t length);
 uint64_t now_us();
 void yield_thread();  // lets another runnable thread have the processor
+int hardware_threads();  // threads the machine runs at once, at least 1
 // Starts fn(arg) on a new thread that lives as long as the process; false if none.
 bool start_thread(void (*fn)(void*), void* arg);
 

@@ -197,6 +197,9 @@ void raise_signal(signal s, int sleepers) {
 
 void yield_thread() { rt::syscall(rt::SYS_sched_yield, 0, 0); }
 
+// The DSP runs four hardware threads; under the emulator, the host's threads stand in.
+int hardware_threads() { return 4; }
+
 const char* env(const char* name) {
   if (const char* value = rt::option(name)) return value;
   if (rt::start_envp == nullptr) return nullptr;

@@ -53,6 +53,11 @@ void raise_signal(signal s, int sleepers) {
 
 const char* env(const char* name) { return std::getenv(name); }
 
+int hardware_threads() {
+  const unsigned n = std::thread::hardware_concurrency();
+  return n > 0 ? static_cast<int>(n) : 1;
+}
+
 void write_log(const char* text, size_t length) { std::fwrite(text, 1, length, stderr); }
 
 uint64_t now_us() {

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <iterator>
 #include <mutex>
 #include <set>
 #include <thread>
@@ -125,14 +126,15 @@ TEST(Loops, RequestedWorkersCapTheTeam) {
   EXPECT_EQ(2u, b.team);
 }
 
-TEST(Loops, WorkerAndJobNumbersAreUniqueAndDense) {
+TEST(Loops, WorkerAndJobNumbersAreUnique) {
   record r;
   ASSERT_EQ(0, run_adsp(4, SingleHVX, r));
   std::set<unsigned> jobs(r.jobs.begin(), r.jobs.end());
   EXPECT_EQ(r.jobs.size(), jobs.size()) << "no job number is handed out twice";
-  // Jobs 0..11 go on, and every worker sees one ending number (12 or above) on its way out.
+  // Jobs 0..11 go on, each once, and every worker sees one ending number (12 or above) on
+  // its way out; workers claim numbers several at a time, so those need not be dense.
   EXPECT_EQ(12u + r.team, r.jobs.size());
-  EXPECT_EQ(11u + r.team, *jobs.rbegin());
+  EXPECT_EQ(11u, *std::next(jobs.begin(), 11));
   std::set<unsigned> workers(r.workers.begin(), r.workers.end());
   EXPECT_LE(workers.size(), r.team);
   EXPECT_LT(*workers.rbegin(), r.team);
