@@ -13,6 +13,7 @@
 #include <thread>
 
 #include "corvane_platform.h"
+#include "host_isa.h"
 
 namespace corvane {
 namespace bench {
@@ -91,6 +92,9 @@ void run_ours(benchmark::State& state, live_case* c, tools::mode m) {
   const char* forced = m == tools::Scalar ? nullptr : std::getenv("CORVANE_BENCH_UNITS");
   const int units = forced ? std::atoi(forced) : tools::units_for(m, tools::kMethodModes[n].modes);
   set_counters(state, 0, units);
+  // The x86-64 level the call runs: the host's for the vector modes, the baseline for the
+  // scalar code, which is compiled once.
+  state.SetLabel(corvane_host_isa_name(m == tools::Scalar ? 0 : corvane_host_isa()));
   if (!remote::kMethods[n].built) {
     state.SkipWithError("not built yet (answers 20)");
     return;
@@ -172,6 +176,7 @@ int main(int argc, char** argv) {
   if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 2;
   corvane::bench::register_all(mode_given, only);
   benchmark::AddCustomContext("opencv_threads", std::to_string(cv::getNumThreads()));
+  benchmark::AddCustomContext("host_isa", corvane_host_isa_name(corvane_host_isa()));
   benchmark::AddCustomContext("hardware_threads", std::to_string(std::thread::hardware_concurrency()));
   benchmark::RunSpecifiedBenchmarks();
   benchmark::Shutdown();

@@ -9,7 +9,8 @@
 #   -o   the report (default BUILD_DIR/bench-report.md; the chart is REPORT.png)
 #   benchmark options go to Google Benchmark, e.g. --benchmark_filter=boxfilter, or
 #   --benchmark_repetitions=5 (the table then shows the medians)
-#   CORVANE_MODE=scalar|shvx|dhvx keeps one mode.
+#   CORVANE_MODE=scalar|shvx|dhvx keeps one mode; CORVANE_HOST_ISA=sse2|avx2|avx512 runs
+#   the vector modes at that x86-64 level (the Level column shows the level used).
 set -euo pipefail
 
 root=$(cd "$(dirname "$0")/.." && pwd)
@@ -96,12 +97,13 @@ started {
     gbs[kase, mode] = f[col["bytes_per_second"]] / 1e9
     if ("ratio" in col) ratio[kase, mode] = f[col["ratio"]]
     if (mode == "opencv") ref[kase] = f[col["label"]]
+    else level[kase, mode] = f[col["label"]]
   }
   if (!((kase, mode) in listed)) { listed[kase, mode] = 1; modes[kase] = modes[kase] " " mode }
 }
 END {
-  print "| Benchmark | Mode | Time [ms] | Mpixel/s | GB/s | Reference | Reference [ms] | Ratio |"
-  print "|---|---|---:|---:|---:|---|---:|---:|"
+  print "| Benchmark | Mode | Level | Time [ms] | Mpixel/s | GB/s | Reference | Reference [ms] | Ratio |"
+  print "|---|---|---|---:|---:|---:|---|---:|---:|"
   for (c = 1; c <= cases; c++) {
     kase = order[c]
     nm = split(modes[kase], ms_, " ")
@@ -111,11 +113,11 @@ END {
       reference = (kase in ref) ? ref[kase] : ((kase, "opencv") in err ? err[kase, "opencv"] : "")
       ref_ms = ((kase, "opencv") in t) ? sprintf("%.3f", t[kase, "opencv"]) : ""
       if ((kase, mode) in err) {
-        printf "| %s | %s | skipped: %s | | | %s | %s | |\n", kase, mode_name(mode), err[kase, mode], reference, ref_ms
+        printf "| %s | %s | | skipped: %s | | | %s | %s | |\n", kase, mode_name(mode), err[kase, mode], reference, ref_ms
         continue
       }
       r = ((kase, mode) in ratio && ratio[kase, mode] > 0) ? sprintf("%.2f", ratio[kase, mode]) : ""
-      printf "| %s | %s | %.3f | %.0f | %.2f | %s | %s | %s |\n", kase, mode_name(mode), t[kase, mode],
+      printf "| %s | %s | %s | %.3f | %.0f | %.2f | %s | %s | %s |\n", kase, mode_name(mode), level[kase, mode], t[kase, mode],
              mpix[kase, mode], gbs[kase, mode], reference, ref_ms, r
       if (r != "") printf "\"%s %s\" %s\n", kase, mode, r > dat
     }
