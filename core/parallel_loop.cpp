@@ -10,11 +10,9 @@ bool compute_recommended() {
   return query.value != COMPUTE_RECOMMENDATION_NOT_OK;
 }
 
-void submit_and_wait(dspCV_synctoken_t& token, void (*worker)(void*), void* data, unsigned jobs, bool caller_works) {
-  const unsigned pooled = caller_works && jobs > 0 ? jobs - 1 : jobs;
-  for (unsigned i = 0; i < pooled; ++i)
+void submit_and_wait(dspCV_synctoken_t& token, void (*worker)(void*), void* data, unsigned jobs) {
+  for (unsigned i = 0; i < jobs; ++i)
     if (dspCV_worker_pool_submit({worker, data}) != 0) dspCV_worker_pool_synctoken_jobdone(&token);
-  if (pooled != jobs) worker(data);  // its jobdone counts like a pool thread's
   dspCV_worker_pool_synctoken_wait(&token);
 }
 
@@ -101,8 +99,7 @@ AEEResult ParallelLoop::run_loop(ParallelLoop* loop, unsigned numberOfWorkers) {
   if (loop->prolog(numThreads) != 0) return RESULT_LOOP_START;
   void (*callback)(void*) = loop->mode == SingleHVX ? callback_64 : loop->mode == DualHVX ? callback_128 : nullptr;
   if (callback == nullptr) return RESULT_LOOP_START;
-  // The caller holds no context of its own here (the job's units are the loop's).
-  loop_detail::submit_and_wait(info.token, callback, &info, numThreads, /*caller_works=*/true);
+  loop_detail::submit_and_wait(info.token, callback, &info, numThreads);
   return loop->epilog(numThreads) == 0 ? RESULT_OK : RESULT_LOOP_EPILOG;
 }
 

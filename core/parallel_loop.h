@@ -23,11 +23,7 @@ template <class Loop> struct callback_info {
 bool compute_recommended();
 // Submits `jobs` jobs of worker(data) to the pool and waits on `token` (initialised for
 // them) until all are done. A job the pool refuses counts as done, so the wait ends.
-// With caller_works, the calling thread runs the last of them itself instead of sleeping
-// while the pool's threads wake up; only for a caller that holds no vector context, since
-// the worker locks one.
-void submit_and_wait(dspCV_synctoken_t& token, void (*worker)(void*), void* data, unsigned jobs,
-                     bool caller_works = false);
+void submit_and_wait(dspCV_synctoken_t& token, void (*worker)(void*), void* data, unsigned jobs);
 }  // namespace loop_detail
 
 namespace cv {
