@@ -21,11 +21,14 @@ namespace hvx {
 // f(isa_c<level>()) for the level of vector code that the host chose at load (host_isa.h);
 // f(isa_c<0>()) in a build of one level, the DSP's among them.
 template <class F> inline auto on_host_isa(F&& f) {
+#if CORVANE_ISA_MAX > 0
+  const int level = corvane_host_isa();
+#endif
 #if CORVANE_ISA_MAX >= 2
-  if (corvane_host_isa() == 2) return f(isa_c<2>());
+  if (level == 2) return f(isa_c<2>());
 #endif
 #if CORVANE_ISA_MAX >= 1
-  if (corvane_host_isa() == 1) return f(isa_c<1>());
+  if (level == 1) return f(isa_c<1>());
 #endif
   return f(isa_c<0>());
 }

@@ -241,7 +241,7 @@ constexpr nstd::array<box_routine<M>, box::k16s.members()> boxfilter16sHvxFuncTa
 
 template <hvx::mode_enum M, int Isa>
 AEEResult boxfilter<M, Isa>::run(hvx::for_mode<M> mode, gen_in& _input, int32_t ddepth, int32_t kernel_width,
-                            int32_t kernel_height, uint8_t normalize, gen_out& _buffer, gen_out& _output) {
+                                 int32_t kernel_height, uint8_t normalize, gen_out& _buffer, gen_out& _output) {
   const int index = box::k8u.index_of(kernel_width, kernel_height, ddepth, normalize != 0);
   if (index < 0) return hvx::RESULT_UNSUPPORTED;
   boxfilterHvxFuncTab<M>[index](mode, _input, _buffer, _output);

@@ -13,10 +13,7 @@ CORVANE_API AEEResult corvane_deinterleave2C(const corvane_mbufd* input_desc, co
   gen_in in(input_desc, input);
   GenInOutArray<false, 2> outputs(outputs_desc, output0, output1);
   if (!hvx::single::deinterleave2C_reach(in, outputs).fits()) return hvx::RESULT_BAD_POINTER;
-  hvx::on_host_isa([&](auto isa) {
-    hvx::single::deinterleave2C<decltype(isa)::value>(in, outputs);
-    return 0;
-  });
+  hvx::on_host_isa([&](auto isa) { hvx::single::deinterleave2C<decltype(isa)::value>(in, outputs); });
   return hvx::RESULT_OK;
 }
 

@@ -5,7 +5,8 @@
 namespace cv {
 namespace adsp {
 
-template <hvx::mode_enum M, int Isa> AEEResult identity<M, Isa>::run(hvx::for_mode<M> mode, gen_in _input, gen_out _output) {
+template <hvx::mode_enum M, int Isa>
+AEEResult identity<M, Isa>::run(hvx::for_mode<M> mode, gen_in _input, gen_out _output) {
   // Released at the end of run, not only at the end of the dispatcher.
   hvx::mode_lock guard = hvx::adopt_lock(mode);
   typedef hvx::gen_vec<M> vec;

@@ -14,7 +14,7 @@
 namespace {
 
 const char* const kNames[] = {"sse2", "avx2", "avx512"};
-constexpr int kLevels = 3;
+constexpr int kLevels = sizeof(kNames) / sizeof(kNames[0]);
 
 int cpu_level() {
   __builtin_cpu_init();

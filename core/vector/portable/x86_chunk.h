@@ -11,9 +11,9 @@ namespace hvx {
 CORVANE_ISA_BEGIN
 namespace x86 {
 
-typedef char bytes __attribute__((vector_size(CORVANE_CHUNK_BYTES)));
-typedef short halves __attribute__((vector_size(CORVANE_CHUNK_BYTES)));
-typedef int words __attribute__((vector_size(CORVANE_CHUNK_BYTES)));
+typedef portable_lanes::chunk<char> bytes;
+typedef portable_lanes::chunk<short> halves;
+typedef portable_lanes::chunk<int> words;
 
 // name(a, b) is the instruction `insn` on one chunk; the 64-byte forms are the masked
 // builtins with every lane kept.
