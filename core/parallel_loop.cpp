@@ -26,21 +26,22 @@ template <class Loop> void init_info(callback_info<Loop>& info, Loop* loop, unsi
   dspCV_worker_pool_synctoken_init(&info.token, threads);
 }
 
-// Job numbers a worker claims at once after its first: consecutive numbers, run in order,
-// so that small jobs do not queue on the one counter.
-constexpr unsigned kJobsPerClaim = 4;
+// Job numbers a worker claims at once: consecutive numbers, run in order, so that small
+// jobs do not queue on the one counter. A worker's claims double from one number up to 64: a worker that streams through a
+// long run of neighbouring jobs keeps the hardware prefetcher and the TLB on its side
+// (alternating short claims between two cores made a memory-bound split 2x slower on a
+// 2-core host), while the first, short claims still spread a small loop over the team.
+constexpr unsigned kMaxJobsPerClaim = 64;
 
 // Takes job numbers until body says this worker is done. The first claim is of one
 // number, so that a body that ends at once sees one number per worker and the counter
 // ends at the team size; a worker told to stop leaves the rest of its claim unseen, all
 // of them past the end of the work.
 template <class Loop> void run_jobs(callback_info<Loop>& info, unsigned worker_id) {
-  unsigned claim = 1;
-  for (;;) {
+  for (unsigned claim = 1;; claim = nstd::min(2 * claim, kMaxJobsPerClaim)) {
     const unsigned first = __atomic_fetch_add(&info.jobCount, claim, __ATOMIC_SEQ_CST);
     for (unsigned job_id = first; job_id != first + claim; ++job_id)
       if (info.loop->body(worker_id, job_id)) return;
-    claim = kJobsPerClaim;
   }
 }
 
