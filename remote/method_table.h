@@ -81,17 +81,17 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
 // clang-format off
 #define CORVANE_REMOTE_METHODS(M)                                                                                 \
   M(0, identity, built, (in(mbufd, "desc"), in(imbuf, "src"), rout(ombuf, "dst")))                                \
-  M(1, vadd_mm, later, (in(seq_u8, "src1"), in(u8, "src1Depth"), in(seq_u8, "src2"), in(u8, "src2Depth"),         \
+  M(1, vadd_mm, built, (in(seq_u8, "src1"), in(u8, "src1Depth"), in(seq_u8, "src2"), in(u8, "src2Depth"),         \
       in(seq_u8, "mask"), rout(seq_u8, "dst"), in(u8, "dstDepth")))                                               \
-  M(2, vsub_mm, later, (in(seq_u8, "srnc1"), in(u8, "src1Depth"), in(seq_u8, "src2"), in(u8, "src2Depth"),        \
+  M(2, vsub_mm, built, (in(seq_u8, "srnc1"), in(u8, "src1Depth"), in(seq_u8, "src2"), in(u8, "src2Depth"),        \
       in(seq_u8, "mask"), rout(seq_u8, "dst"), in(u8, "dstDepth")))                                               \
-  M(3, vmul_mm, later, (in(seq_u8, "src1"), in(u8, "src1Depth"), in(seq_u8, "src2"), in(u8, "src2Depth"),         \
+  M(3, vmul_mm, built, (in(seq_u8, "src1"), in(u8, "src1Depth"), in(seq_u8, "src2"), in(u8, "src2Depth"),         \
       rout(seq_u8, "dst"), in(u8, "dstDepth")))                                                                   \
-  M(4, vmul_scale, later, (in(seq_u8, "src"), in(u8, "srcDepth"), in(i32, "scale"), rout(seq_u8, "dst"),          \
+  M(4, vmul_scale, built, (in(seq_u8, "src"), in(u8, "srcDepth"), in(i32, "scale"), rout(seq_u8, "dst"),          \
       in(u8, "dstDepth")))                                                                                        \
-  M(5, vdiv_mm, later, (in(seq_u8, "src1"), in(u8, "src1Depth"), in(seq_u8, "src2"), in(u8, "src2Depth"),         \
+  M(5, vdiv_mm, built, (in(seq_u8, "src1"), in(u8, "src1Depth"), in(seq_u8, "src2"), in(u8, "src2Depth"),         \
       rout(seq_u8, "dst"), in(u8, "dstDepth")))                                                                   \
-  M(6, vdiv_scale, later, (in(i32, "scale"), in(seq_u8, "src"), in(u8, "srcDepth"), rout(seq_u8, "dst"),          \
+  M(6, vdiv_scale, built, (in(i32, "scale"), in(seq_u8, "src"), in(u8, "srcDepth"), rout(seq_u8, "dst"),          \
       in(u8, "dstDepth")))                                                                                        \
   M(7, hvx_sum, later, (in(seq_u8, "src"), rout(seq_i32, "dst"), in(i32, "data_size"), in(i32, "depth"),          \
       in(i32, "cn")))                                                                                             \

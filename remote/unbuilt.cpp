@@ -10,16 +10,6 @@ constexpr AEEResult kNotBuilt = hvx::RESULT_NOT_IMPLEMENTED;
 
 extern "C" {
 
-AEEResult corvane_vadd_mm(const uint8_t*, int, uint8_t, const uint8_t*, int, uint8_t, const uint8_t*, int, uint8_t*,
-    int, uint8_t) { return kNotBuilt; }
-AEEResult corvane_vsub_mm(const uint8_t*, int, uint8_t, const uint8_t*, int, uint8_t, const uint8_t*, int, uint8_t*,
-    int, uint8_t) { return kNotBuilt; }
-AEEResult corvane_vmul_mm(const uint8_t*, int, uint8_t, const uint8_t*, int, uint8_t, uint8_t*, int,
-    uint8_t) { return kNotBuilt; }
-AEEResult corvane_vmul_scale(const uint8_t*, int, uint8_t, int32_t, uint8_t*, int, uint8_t) { return kNotBuilt; }
-AEEResult corvane_vdiv_mm(const uint8_t*, int, uint8_t, const uint8_t*, int, uint8_t, uint8_t*, int,
-    uint8_t) { return kNotBuilt; }
-AEEResult corvane_vdiv_scale(int32_t, const uint8_t*, int, uint8_t, uint8_t*, int, uint8_t) { return kNotBuilt; }
 AEEResult corvane_hvx_sum(const uint8_t*, int, int32_t*, int, int32_t, int32_t, int32_t) { return kNotBuilt; }
 AEEResult corvane_convertScaleAbs(const corvane_mbufd*, const corvane_mbufd*, const corvane_mbuf*, corvane_mbuf*,
     double, double) { return kNotBuilt; }
