@@ -101,7 +101,7 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
       rout(ombuf, "output0"), rout(ombuf, "output1"), rout(ombuf, "output2")))                                    \
   M(10, deinterleave4C, built,  (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),           \
       rout(ombuf, "output0"), rout(ombuf, "output1"), rout(ombuf, "output2"), rout(ombuf, "output3")))            \
-  M(11, convertScaleAbs, later, (in(mbufd, "desc_in"), in(mbufd, "desc_out"), in(imbuf, "src"),                   \
+  M(11, convertScaleAbs, built, (in(mbufd, "desc_in"), in(mbufd, "desc_out"), in(imbuf, "src"),                   \
       rout(ombuf, "dst"), in(f64, "alpha"), in(f64, "beta")))                                                     \
   M(12, get_kernel_execution_time, built, (rout(u64, "time"), rout(u64, "cycles"), rout(string, "msg"),           \
       in(u8, "reset")))                                                                                           \

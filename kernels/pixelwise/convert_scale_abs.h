@@ -1,0 +1,50 @@
+// convertScaleAbs: a signed 16-bit image to an unsigned 8-bit one, each element
+// min(|alpha * x + beta|, 255). The vector modes work in 32-bit fixed point and convert
+// the whole stride of every row; the scalar mode works in float on `cols` elements.
+#ifndef CORVANE_KERNELS_PIXELWISE_CONVERT_SCALE_ABS_H
+#define CORVANE_KERNELS_PIXELWISE_CONVERT_SCALE_ABS_H
+
+#include "core/hvx_modes.h"
+#include "core/membuf.h"
+#include "core/reach.h"
+#include "core/result.h"
+#include "core/vector/isa.h"
+
+namespace cv {
+namespace adsp {
+
+// The fixed-point form of alpha and beta: scaled by 2^shift, with shift the largest
+// (up to 23) that keeps the biggest possible |alpha * x + beta| below 2^31.
+struct fixed_scale {
+  int shift;
+  int int_alpha;
+  int int_beta;
+};
+fixed_scale choose_fixed_scale(double alpha, double beta);
+
+template <hvx::mode_enum M, int Isa = hvx::this_isa> struct convertScaleAbs {
+  static AEEResult run(hvx::for_mode<M> mode, gen_in input, gen_out output, double alpha, double beta);
+
+  // Scalar: `cols` elements a row. Vector modes: a row's whole stride, rounded down to
+  // vectors (at least one), in; half as many vectors, rounded up, out; rows are whole
+  // vectors apart. The input's rows count for both.
+  static hvx::reach reach(const gen_in& input, const gen_out& output, double, double) {
+    const int64_t rows = nstd::max(input.rows(), 0);
+    hvx::reach r;
+    r.refuse_if(input.stride_bytes() < 0 || output.stride_bytes() < 0 || input.cols() < 0);
+    if (M == hvx::Scalar) {
+      const int64_t cols = input.cols();
+      return r.rows(input.buffer, rows, input.stride_bytes() / 2 * 2, 2 * cols)
+          .rows(output.buffer, rows, output.stride_bytes(), cols);
+    }
+    constexpr int64_t V = hvx::mode_align<M>;
+    const int64_t n = nstd::max<int64_t>(input.stride_bytes() / V, 1);
+    return r.rows(input.buffer, rows, input.stride_bytes() / V * V, n * V, V)
+        .rows(output.buffer, rows, output.stride_bytes() / V * V, hvx::div_up(n, 2) * V, V);
+  }
+};
+
+}  // namespace adsp
+}  // namespace cv
+
+#endif

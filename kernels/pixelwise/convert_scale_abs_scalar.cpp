@@ -1,0 +1,25 @@
+// convertScaleAbs on the scalar core, in float: `cols` elements a row.
+#include "kernels/pixelwise/convert_scale_abs.h"
+
+namespace cv {
+namespace adsp {
+
+template <>
+AEEResult convertScaleAbs<hvx::Scalar>::run(hvx::for_mode<hvx::Scalar>, gen_in _input, gen_out _output, double alpha,
+                                            double beta) {
+  in<int16_t> input(_input);
+  out<uint8_t> output(_output);
+  const float a = static_cast<float>(alpha), b = static_cast<float>(beta);
+  for (int row = 0; row < input.rows(); ++row) {
+    const int16_t* x = input.begin() + static_cast<size_t>(row) * input.stride_vectors();
+    uint8_t* o = output.begin() + static_cast<size_t>(row) * output.stride_vectors();
+    for (int i = 0; i < input.cols(); ++i) {
+      const float r = __builtin_fabsf(__builtin_fmaf(a, static_cast<float>(x[i]), b));
+      o[i] = r < 255.0f ? static_cast<uint8_t>(r) : 255;
+    }
+  }
+  return hvx::RESULT_OK;
+}
+
+}  // namespace adsp
+}  // namespace cv
