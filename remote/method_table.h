@@ -179,7 +179,7 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
       rout(ombuf, "output"), in(i32, "channel"), in(seq_u8, "ranges")))                                           \
   M(46, calcHist, later, (in(mbufd, "in_desc"), in(imbuf, "input"), in(mbufd, "out_desc"),                        \
       rout(ombuf, "output"), in(seq_u8, "channels"), in(seq_u8, "ranges")))                                       \
-  M(47, thresh, later, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "dstDesc"), rout(ombuf, "dst"),         \
+  M(47, thresh, built, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "dstDesc"), rout(ombuf, "dst"),         \
       in(i32, "threshold"), in(i32, "max"), in(u32, "op")))                                                       \
   M(48, integrate, later, (in(seq_u8, "inp"), in(i32, "srcStride"), in(i32, "srcWidth"), in(i32, "srcHeight"),    \
       rout(seq_u32, "outp"), in(i32, "dstStride")))                                                               \

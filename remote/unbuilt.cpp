@@ -68,8 +68,6 @@ AEEResult corvane_calcHist_8u1d(const corvane_mbufd*, const corvane_mbuf*, const
     int32_t, const uint8_t*, int) { return kNotBuilt; }
 AEEResult corvane_calcHist(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
     const uint8_t*, int, const uint8_t*, int) { return kNotBuilt; }
-AEEResult corvane_thresh(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, int32_t,
-    int32_t, uint32_t) { return kNotBuilt; }
 AEEResult corvane_integrate(const uint8_t*, int, int32_t, int32_t, int32_t, uint32_t*, int,
     int32_t) { return kNotBuilt; }
 AEEResult corvane_filter2D(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
