@@ -93,7 +93,7 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
       rout(seq_u8, "dst"), in(u8, "dstDepth")))                                                                   \
   M(6, vdiv_scale, built, (in(i32, "scale"), in(seq_u8, "src"), in(u8, "srcDepth"), rout(seq_u8, "dst"),          \
       in(u8, "dstDepth")))                                                                                        \
-  M(7, hvx_sum, later, (in(seq_u8, "src"), rout(seq_i32, "dst"), in(i32, "data_size"), in(i32, "depth"),          \
+  M(7, hvx_sum, built, (in(seq_u8, "src"), rout(seq_i32, "dst"), in(i32, "data_size"), in(i32, "depth"),          \
       in(i32, "cn")))                                                                                             \
   M(8, deinterleave2C, built,  (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),            \
       rout(ombuf, "output0"), rout(ombuf, "output1")))                                                            \

@@ -10,7 +10,6 @@ constexpr AEEResult kNotBuilt = hvx::RESULT_NOT_IMPLEMENTED;
 
 extern "C" {
 
-AEEResult corvane_hvx_sum(const uint8_t*, int, int32_t*, int, int32_t, int32_t, int32_t) { return kNotBuilt; }
 AEEResult corvane_sobel8u(const uint8_t*, int, int32_t, int32_t, int32_t, uint8_t*, int,
     uint32_t) { return kNotBuilt; }
 AEEResult corvane_sobel16s(const uint8_t*, int, int32_t, int32_t, int32_t, int16_t*, int, uint32_t,
