@@ -40,17 +40,6 @@ void put_le(uint8_t* p, uint64_t v, int bytes) {
 
 }  // namespace
 
-arg f32(float v) {
-  uint32_t b;
-  memcpy(&b, &v, 4);
-  return arg{arg::scalar, {}, 0, b, {}};
-}
-arg f64(double v) {
-  uint64_t b;
-  memcpy(&b, &v, 8);
-  return arg{arg::scalar, {}, 0, b, {}};
-}
-
 void reset_arena() { arena_used = 0; }
 
 uint64_t fnv1a(uint64_t h, const void* data, size_t n) {

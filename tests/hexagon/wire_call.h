@@ -29,8 +29,8 @@ constexpr arg seq(int32_t count) { return arg{arg::sequence, {}, count, 0, {}}; 
 constexpr arg u32(uint32_t v) { return arg{arg::scalar, {}, 0, v, {}}; }
 constexpr arg i32(int32_t v) { return arg{arg::scalar, {}, 0, static_cast<uint32_t>(v), {}}; }
 constexpr arg u8(uint8_t v) { return arg{arg::scalar, {}, 0, v, {}}; }
-arg f32(float v);
-arg f64(double v);
+constexpr arg f32(float v) { return arg{arg::scalar, {}, 0, __builtin_bit_cast(uint32_t, v), {}}; }
+constexpr arg f64(double v) { return arg{arg::scalar, {}, 0, __builtin_bit_cast(uint64_t, v), {}}; }
 
 constexpr int kMaxBuffers = 2 + 2 * corvane::remote::kMaxParams;
 

@@ -100,6 +100,31 @@ std::vector<method_case> cases() {
        {9 * 256, 10 * 512, 7 * 512}, {true, false, true},
        {negative_stride, negative_rows, huge_image, no_channels, huge_row, huge_pixel},
        [](const corvane_mbufd* d, corvane_mbuf* b) { return box(d, b, 4); }},
+      // Flat runs: 10 vectors of u8 in, u16 out; the longer input sets the count.
+      {"vadd_mm", {1, 4}, {desc(0, 0, 0)}, {640, 640, 1280}, {true, true, true}, {},
+       [](const corvane_mbufd*, corvane_mbuf* b) {
+         return corvane_vadd_mm(b[0].mem, b[0].memLen, 0, b[1].mem, b[1].memLen, 0, nullptr, 0, b[2].mem,
+                                b[2].memLen, 2);
+       }},
+      // 32 int16 elements into int32: no alignment on the scalar core.
+      {"vdiv_mm", {0}, {desc(0, 0, 0)}, {64, 64, 128}, {true, true, true}, {},
+       [](const corvane_mbufd*, corvane_mbuf* b) {
+         return corvane_vdiv_mm(b[0].mem, b[0].memLen, 3, b[1].mem, b[1].memLen, 3, b[2].mem, b[2].memLen, 4);
+       }},
+      {"hvx_sum", {1, 4}, {desc(0, 0, 0)}, {1000, 64}, {true, true}, {},
+       [](const corvane_mbufd*, corvane_mbuf* b) {
+         return corvane_hvx_sum(b[0].mem, b[0].memLen, reinterpret_cast<int32_t*>(b[1].mem), b[1].memLen / 4, 1000,
+                                0, 3);
+       }},
+      // 256 int16 a row fill the 512-byte stride: 8 or 4 vectors in, 256 bytes out in every mode.
+      {"convertScaleAbs", {0, 1, 4}, {desc(512, 256, 5, 1, 3), desc(256, 256, 5)}, {5 * 512, 5 * 256},
+       {true, true}, {negative_stride, huge_image},
+       [](const corvane_mbufd* d, corvane_mbuf* b) {
+         return corvane_convertScaleAbs(&d[0], &d[1], &b[0], &b[1], 0.5, 3.0);
+       }},
+      {"thresh", {2, 4}, {desc(256, 256, 4)}, {1024, 1024}, {true, true},
+       {negative_stride, huge_image, no_channels, huge_row},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return corvane_thresh(&d[0], &b[0], &d[0], &b[1], 9, 200, 0); }},
   };
 }
 
