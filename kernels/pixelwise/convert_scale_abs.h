@@ -26,8 +26,8 @@ template <hvx::mode_enum M, int Isa = hvx::this_isa> struct convertScaleAbs {
   static AEEResult run(hvx::for_mode<M> mode, gen_in input, gen_out output, double alpha, double beta);
 
   // Scalar: `cols` elements a row. Vector modes: a row's whole stride, rounded down to
-  // vectors (at least one), in; half as many vectors, rounded up, out; rows are whole
-  // vectors apart. The input's rows count for both.
+  // vectors (at least one), in; half as many vectors, rounded up, out; strides are whole
+  // vectors. The input's rows count for both.
   static hvx::reach reach(const gen_in& input, const gen_out& output, double, double) {
     const int64_t rows = nstd::max(input.rows(), 0);
     hvx::reach r;
@@ -38,6 +38,7 @@ template <hvx::mode_enum M, int Isa = hvx::this_isa> struct convertScaleAbs {
           .rows(output.buffer, rows, output.stride_bytes(), cols);
     }
     constexpr int64_t V = hvx::mode_align<M>;
+    r.refuse_if(input.stride_bytes() % V != 0 || output.stride_bytes() % V != 0);  // rows are walked in vectors
     const int64_t n = nstd::max<int64_t>(input.stride_bytes() / V, 1);
     return r.rows(input.buffer, rows, input.stride_bytes() / V * V, n * V, V)
         .rows(output.buffer, rows, output.stride_bytes() / V * V, hvx::div_up(n, 2) * V, V);

@@ -25,11 +25,13 @@ inline int64_t row_vectors(const InOutPtrBase& input) {
   return nstd::max<int64_t>(div_up(int64_t(input.cols()) * input.channels(), 128 / element_bytes(input)), 1);
 }
 
-// Every row of the input's, whole 128-byte vectors, in both views, each walked by its
-// stride in whole vectors.
+// Every row of the input's, whole 128-byte vectors, in both views; strides are whole
+// vectors, since the rows are walked in vectors.
 inline reach thresh_reach(const InOutPtrBase& input, const InOutPtrBase& output) {
   const int64_t e = element_bytes(input);
-  if (e < 1 || e > 128 || input.stride_bytes() < 0 || output.stride_bytes() < 0) return reach().refuse_if(true);
+  const bool whole_vectors = input.stride_bytes() % 128 == 0 && output.stride_bytes() % 128 == 0;
+  if (e < 1 || e > 128 || input.stride_bytes() < 0 || output.stride_bytes() < 0 || !whole_vectors)
+    return reach().refuse_if(true);
   const int64_t rows = nstd::max(input.rows(), 0), bytes = row_vectors(input) * 128;
   return reach()
       .rows(input.buffer, rows, input.stride_bytes() / 128 * 128, bytes, 128)
