@@ -176,7 +176,8 @@ TEST(Threshold32, KeepsOnlyWhatIsAbove) {
       for (int32_t value : {0, 7, -2, INT32_MIN, INT32_MAX}) {
         SCOPED_TRACE(::testing::Message() << "mode " << mode << ", value " << value << ", in place " << in_place);
         alignas(128) int32_t words[kWords], result[kWords + 32];
-        for (int i = 0; i < kWords; ++i) words[i] = pattern[i % 14] + (i / 14) * (i % 2 ? 1 : -1);
+        for (int i = 0; i < kWords; ++i)
+          words[i] = int32_t(uint32_t(pattern[i % 14]) + uint32_t((i / 14) * (i % 2 ? 1 : -1)));
         std::fill(result, result + kWords + 32, kCanary);
         std::vector<int32_t> want(words, words + kWords);
         for (int32_t& w : want) w = w > value ? w : 0;
