@@ -1,14 +1,20 @@
 // Pixel-wise kernels on a 1920x1080 frame: identity against cv::Mat::copyTo of the same
-// bytes, and the two-channel split against cv::split.
+// bytes, the two-channel split against cv::split, and the element-wise arithmetic,
+// convertScaleAbs, thresh and hvx_sum against OpenCV's operations of the same types.
+// The flat-buffer methods take the frame's bytes as one buffer (no row padding at 1920
+// columns).
 #include <memory>
 
 #include <opencv2/core.hpp>
+#include <opencv2/imgproc.hpp>
 
 #include "bench/harness.h"
 
 namespace corvane {
 namespace bench {
 namespace {
+
+constexpr int32_t U8 = client::U8, U16 = client::U16, I16 = client::I16;
 
 struct copy_images {
   Image src{kFrameCols, kFrameRows, 1, client::U8};
@@ -21,6 +27,44 @@ struct split_images {
   Image plane0{kFrameCols, kFrameRows, 1, client::U8};
   Image plane1{kFrameCols, kFrameRows, 1, client::U8};
   split_images() { src.fill_random(2); }
+};
+
+// Two random inputs and an output of a given type; also the images of the one-input methods.
+struct two_inputs {
+  Image a, b, dst;
+  two_inputs(int32_t in, int32_t out, uint32_t seed)
+      : a(kFrameCols, kFrameRows, 1, in), b(kFrameCols, kFrameRows, 1, in), dst(kFrameCols, kFrameRows, 1, out) {
+    a.fill_random(seed);
+    b.fill_random(seed + 1);
+  }
+};
+
+// The depth code's bytes per element, over the whole frame.
+int64_t bytes_of(int32_t depth) { return kFramePixels * client::element_size(depth); }
+
+using binary_fn = AEEResult (*)(const uint8_t*, int, int, const uint8_t*, int, int, uint8_t*, int, int);
+
+// A two-input element-wise method from depth `in` to depth `out` beside `reference`.
+bench_case binary_case(const char* name, int number, binary_fn fn, int32_t in, int32_t out, const char* ref_name,
+                       void (*reference)(const cv::Mat& a, const cv::Mat& b, cv::Mat& dst)) {
+  return {name, number, tools::ALL, kFramePixels, 2 * bytes_of(in) + bytes_of(out), ref_name,
+          [=] {
+            auto img = std::make_shared<two_inputs>(in, out, uint32_t(number));
+            return calls{[img, fn, in, out] {
+                           return fn(img->a.data(), int(img->a.byte_size()), in, img->b.data(),
+                                     int(img->b.byte_size()), in, img->dst.data(), int(img->dst.byte_size()), out);
+                         },
+                         [img, reference, a = as_mat(img->a), b = as_mat(img->b), dst = as_mat(img->dst)]() mutable {
+                           reference(a, b, dst);
+                         }};
+          }};
+}
+
+struct sum_images {
+  Image src{kFrameCols, kFrameRows, 3, client::U8};
+  alignas(64) int32_t lanes[16] = {};
+  cv::Scalar totals;
+  sum_images() { src.fill_random(9); }
 };
 
 CORVANE_BENCH_CASES(pixelwise_cases) {
@@ -44,6 +88,66 @@ CORVANE_BENCH_CASES(pixelwise_cases) {
                                                                                   as_mat(img->plane1)}]() mutable {
                         cv::split(src, planes.data());
                       }};
+       }},
+      binary_case("vadd_mm/1920x1080_u8_sat", method::vadd_mm, client::vadd_mm, U8, U8, "cv::add",
+                  [](const cv::Mat& a, const cv::Mat& b, cv::Mat& dst) { cv::add(a, b, dst); }),
+      binary_case("vsub_mm/1920x1080_i16", method::vsub_mm, client::vsub_mm, I16, I16, "cv::subtract",
+                  [](const cv::Mat& a, const cv::Mat& b, cv::Mat& dst) { cv::subtract(a, b, dst); }),
+      binary_case("vmul_mm/1920x1080_u8_u16", method::vmul_mm, client::vmul_mm, U8, U16, "cv::multiply",
+                  [](const cv::Mat& a, const cv::Mat& b, cv::Mat& dst) { cv::multiply(a, b, dst, 1.0, CV_16U); }),
+      binary_case("vdiv_mm/1920x1080_i16", method::vdiv_mm, client::vdiv_mm, I16, I16, "cv::divide",
+                  [](const cv::Mat& a, const cv::Mat& b, cv::Mat& dst) { cv::divide(a, b, dst); }),
+      {"vmul_scale/1920x1080_u8", method::vmul_scale, tools::ALL, kFramePixels, 2 * frame_bytes,
+       "cv::multiply by a scalar",
+       [] {
+         auto img = std::make_shared<two_inputs>(U8, U8, 4);
+         return calls{[img] {
+                        return client::vmul_scale(img->a.data(), int(img->a.byte_size()), U8, 3, img->dst.data(),
+                                                  int(img->dst.byte_size()), U8);
+                      },
+                      [img, a = as_mat(img->a), dst = as_mat(img->dst)]() mutable {
+                        cv::multiply(a, cv::Scalar(3), dst);
+                      }};
+       }},
+      {"convertScaleAbs/1920x1080_i16_u8", method::convertScaleAbs, tools::ALL, kFramePixels, 3 * frame_bytes,
+       "cv::convertScaleAbs",
+       [] {
+         // 1920 i16 elements a row are 30 DualHVX vectors in, 15 out: a u8 row of 1920 bytes.
+         auto img = std::make_shared<two_inputs>(I16, U8, 11);
+         return calls{[img] { return client::convertScaleAbs(img->a, img->dst, 0.75, -20.0); },
+                      [img, a = as_mat(img->a), dst = as_mat(img->dst)]() mutable {
+                        cv::convertScaleAbs(a, dst, 0.75, -20.0);
+                      }};
+       }},
+      {"thresh/1920x1080_u8_binary", method::thresh, tools::ALL, kFramePixels, 2 * frame_bytes,
+       "cv::threshold THRESH_BINARY",
+       [] {
+         auto img = std::make_shared<two_inputs>(U8, U8, 12);
+         return calls{[img] { return client::thresh(img->a, img->dst, 100, 255, 0); },
+                      [img, a = as_mat(img->a), dst = as_mat(img->dst)]() mutable {
+                        cv::threshold(a, dst, 100, 255, cv::THRESH_BINARY);
+                      }};
+       }},
+      {"thresh/1920x1080_i16_trunc", method::thresh, tools::ALL, kFramePixels, 4 * frame_bytes,
+       "cv::threshold THRESH_TRUNC",
+       [] {
+         auto img = std::make_shared<two_inputs>(I16, I16, 13);
+         std::function<void()> reference = [img, a = as_mat(img->a), dst = as_mat(img->b)]() mutable {
+           cv::threshold(a, dst, 1000, 0, cv::THRESH_TRUNC);
+         };
+         try {
+           reference();
+         } catch (const cv::Exception&) {
+           reference = nullptr;  // this OpenCV has no 16-bit signed threshold
+         }
+         return calls{[img] { return client::thresh(img->a, img->dst, 1000, 0, 2); }, reference};
+       }},
+      {"hvx_sum/1920x1080_u8_3c", method::hvx_sum, tools::ALL, kFramePixels, 3 * frame_bytes + 64, "cv::sum", [] {
+         auto img = std::make_shared<sum_images>();
+         return calls{[img] {
+                        return client::hvx_sum(img->src.data(), int(img->src.byte_size()), U8, 3, img->lanes);
+                      },
+                      [img, src = as_mat(img->src)] { img->totals = cv::sum(src); }};
        }},
   };
 }

@@ -20,6 +20,50 @@ AEEResult deinterleave2C(const Image& src, Image& plane0, Image& plane1) {
                                       &plane1.mbuf());
 }
 
+AEEResult vadd_mm(const uint8_t* src1, int src1_len, int src1_depth, const uint8_t* src2, int src2_len,
+                  int src2_depth, uint8_t* dst, int dst_len, int dst_depth) {
+  return call<method::vadd_mm>(src1, src1_len, src1_depth, src2, src2_len, src2_depth, nullptr, 0, dst, dst_len,
+                               dst_depth);
+}
+
+AEEResult vsub_mm(const uint8_t* src1, int src1_len, int src1_depth, const uint8_t* src2, int src2_len,
+                  int src2_depth, uint8_t* dst, int dst_len, int dst_depth) {
+  return call<method::vsub_mm>(src1, src1_len, src1_depth, src2, src2_len, src2_depth, nullptr, 0, dst, dst_len,
+                               dst_depth);
+}
+
+AEEResult vmul_mm(const uint8_t* src1, int src1_len, int src1_depth, const uint8_t* src2, int src2_len,
+                  int src2_depth, uint8_t* dst, int dst_len, int dst_depth) {
+  return call<method::vmul_mm>(src1, src1_len, src1_depth, src2, src2_len, src2_depth, dst, dst_len, dst_depth);
+}
+
+AEEResult vmul_scale(const uint8_t* src, int src_len, int src_depth, int32_t scale, uint8_t* dst, int dst_len,
+                     int dst_depth) {
+  return call<method::vmul_scale>(src, src_len, src_depth, scale, dst, dst_len, dst_depth);
+}
+
+AEEResult vdiv_mm(const uint8_t* src1, int src1_len, int src1_depth, const uint8_t* src2, int src2_len,
+                  int src2_depth, uint8_t* dst, int dst_len, int dst_depth) {
+  return call<method::vdiv_mm>(src1, src1_len, src1_depth, src2, src2_len, src2_depth, dst, dst_len, dst_depth);
+}
+
+AEEResult vdiv_scale(int32_t scale, const uint8_t* src, int src_len, int src_depth, uint8_t* dst, int dst_len,
+                     int dst_depth) {
+  return call<method::vdiv_scale>(scale, src, src_len, src_depth, dst, dst_len, dst_depth);
+}
+
+AEEResult hvx_sum(const uint8_t* src, int data_size, int depth, int cn, int32_t* lanes) {
+  return call<method::hvx_sum>(src, data_size, lanes, 16, data_size, depth, cn);
+}
+
+AEEResult convertScaleAbs(const Image& in, Image& out, double alpha, double beta) {
+  return call<method::convertScaleAbs>(&in.descriptor(), &out.descriptor(), &in.mbuf(), &out.mbuf(), alpha, beta);
+}
+
+AEEResult thresh(const Image& src, Image& dst, int32_t threshold, int32_t max, uint32_t op) {
+  return call<method::thresh>(&src.descriptor(), &src.mbuf(), &dst.descriptor(), &dst.mbuf(), threshold, max, op);
+}
+
 AEEResult load() { return call<method::load>(); }
 AEEResult init(uint32_t power_level) { return call<method::init>(power_level); }
 AEEResult setmode(uint32_t power_level) { return call<method::setmode>(power_level); }

@@ -100,7 +100,8 @@ int methods() {
 int usage(FILE* out, int status) {
   std::fprintf(out,
                "usage: corvane <command>\n"
-               "  run <method> [options] IN.png OUT.png   run identity or boxfilter on a PNG file\n"
+               "  run <method> [options] FILES...   run a method on PNG files: identity, boxfilter, thresh,\n"
+               "            convertScaleAbs, vadd_mm, vsub_mm, vmul_mm, vdiv_mm, vmul_scale, vdiv_scale, hvx_sum\n"
                "  demo      identity and the box filter through the remote entry on a built-in image, in each mode\n"
                "  methods   the 53 methods of the remote interface: built or not, and their modes\n"
                "The mode of `run` comes from --mode or CORVANE_MODE (scalar, shvx, dhvx).\n\n");

@@ -2,40 +2,25 @@
 
 #include <cerrno>
 #include <chrono>
-#include <cstdint>
 #include <cmath>
+#include <cstdint>
 #include <cstdlib>
 #include <cstring>
-#include <functional>
-#include <stdexcept>
+#include <memory>
+#include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
-#include "client/corvane_client.h"
 #include "corvane_platform.h"
 #include "tools/boxfilter_args.h"
 #include "tools/png_io.h"
 
 namespace corvane {
 namespace tools {
-
-namespace {
+namespace run_detail {
 
 using client::Image;
-
-struct usage_error : std::runtime_error {
-  using std::runtime_error::runtime_error;
-};
-
-struct options {
-  std::string method, in_path, out_path;
-  bool mode_given = false;
-  mode m = DualHVX;
-  // boxfilter
-  int kernel_width = 3, kernel_height = 3;
-  std::string ddepth;  // empty: the input's own element type
-  bool normalize = true;
-};
 
 int parse_int(const std::string& text, const char* what) {
   char* end = nullptr;
@@ -46,90 +31,22 @@ int parse_int(const std::string& text, const char* what) {
   return int(v);
 }
 
-void parse_ksize(const std::string& text, options& o) {
-  const size_t x = text.find('x');
-  if (x == std::string::npos) {
-    o.kernel_width = o.kernel_height = parse_int(text, "--ksize");
-  } else {
-    o.kernel_width = parse_int(text.substr(0, x), "--ksize");
-    o.kernel_height = parse_int(text.substr(x + 1), "--ksize");
+const char* type_name(int32_t depth) {
+  switch (depth) {
+    case client::U8: return "u8";
+    case client::U16: return "u16";
+    case client::I16: return "i16";
+    case client::I32: return "i32";
+    case client::F32: return "f32";
+    default: return "?";
   }
-  for (int k : {o.kernel_width, o.kernel_height})
-    if (k < 1 || k > 15 || k % 2 == 0)
-      throw usage_error("--ksize " + text + ": each side is odd, 1 to 15 (an even size is served by the next odd one)");
 }
 
-options parse(int argc, char** argv) {
-  options o;
-  std::vector<std::string> positional;
-  std::string boxfilter_only;  // the last option that only the box filter takes
-  for (int i = 0; i < argc; ++i) {
-    std::string arg = argv[i], value;
-    const bool is_option = arg.size() > 2 && arg.compare(0, 2, "--") == 0;
-    if (!is_option) {
-      positional.push_back(arg);
-      continue;
-    }
-    const size_t eq = arg.find('=');
-    const bool has_inline_value = eq != std::string::npos;
-    if (has_inline_value) {
-      value = arg.substr(eq + 1);
-      arg = arg.substr(0, eq);
-    }
-    auto take_value = [&]() {
-      if (has_inline_value) return value;
-      if (i + 1 >= argc) throw usage_error(arg + " wants a value");
-      return std::string(argv[++i]);
-    };
-    const bool boxfilter_option = arg == "--ksize" || arg == "--ddepth" || arg == "--normalize" || arg == "--no-normalize";
-    if (boxfilter_option) boxfilter_only = arg;
-    if (arg == "--mode") {
-      const std::string name = take_value();
-      if (!parse_mode(name, o.m)) throw usage_error("--mode " + name + ": give scalar, shvx or dhvx");
-      o.mode_given = true;
-    } else if (arg == "--ksize") {
-      parse_ksize(take_value(), o);
-    } else if (arg == "--ddepth") {
-      o.ddepth = take_value();
-    } else if ((arg == "--normalize" || arg == "--no-normalize") && !has_inline_value) {
-      o.normalize = arg == "--normalize";
-    } else {
-      throw usage_error("unknown option " + arg);
-    }
-  }
-  if (positional.size() != 3)
-    throw usage_error("wants a method and two files, IN.png OUT.png (got " + std::to_string(positional.size()) +
-                      " words)");
-  o.method = positional[0];
-  o.in_path = positional[1];
-  o.out_path = positional[2];
-  if (o.method != "identity" && o.method != "boxfilter")
-    throw usage_error("no method '" + o.method + "' to run on files; identity and boxfilter are");
-  if (o.method != "boxfilter" && !boxfilter_only.empty())
-    throw usage_error(boxfilter_only + " is an option of boxfilter only");
-  return o;
+std::string shape_of(const Image& image) {
+  return std::to_string(image.cols()) + "x" + std::to_string(image.rows()) + ", " +
+         std::to_string(image.channels()) + " channel(s)";
 }
 
-// The ddepth argument from a code (0 to 5) or an element type's name, for this input.
-int parse_ddepth(const std::string& text, const Image& in) {
-  const bool eight_bit = in.depth() == client::U8;
-  int code;
-  if (text.empty()) code = eight_bit ? 0 : 3;
-  else if (text == "u8") code = 0;
-  else if (text == "i16") code = 3;
-  else if (text == "i32") code = 4;
-  else if (text == "f32") code = 5;
-  else code = parse_int(text, "--ddepth");
-  const bool name_fits = !(eight_bit && text == "i32") && !(!eight_bit && (text == "f32" || text == "u8"));
-  if (!name_fits || boxfilter_output_depth(in.depth(), code) < 0)
-    throw usage_error("--ddepth " + text + ": " +
-                      (eight_bit ? "8-bit input gives u8 (0, 1), i16 (2, 3) or f32 (4, 5)"
-                                 : "16-bit input gives i16 (2, 3) or i32 (4, 5)"));
-  return code;
-}
-
-// The image as a PNG can hold it: 8-bit stays, 16-bit and 32-bit samples become 16-bit
-// ones, rounded and clamped to 0..65535 (negative sums read as 0).
 Image png_ready(const Image& out) {
   if (out.depth() == client::U8 || out.depth() == client::U16) return out;
   Image png(out.cols(), out.rows(), out.channels(), client::U16);
@@ -158,15 +75,225 @@ Image png_ready(const Image& out) {
   return png;
 }
 
-const char* type_name(int32_t depth) {
-  switch (depth) {
-    case client::U8: return "u8";
-    case client::U16: return "u16";
-    case client::I16: return "i16";
-    case client::I32: return "i32";
-    case client::F32: return "f32";
-    default: return "?";
+}  // namespace run_detail
+
+namespace {
+
+using client::Image;
+using namespace run_detail;
+namespace method = remote::method;
+
+double parse_double(const std::string& text, const char* what) {
+  char* end = nullptr;
+  errno = 0;
+  const double v = std::strtod(text.c_str(), &end);
+  if (text.empty() || *end != '\0' || errno != 0 || !std::isfinite(v))
+    throw usage_error(std::string(what) + " wants a number, not '" + text + "'");
+  return v;
+}
+
+// The index of `text` in `names`, else a usage error that lists them.
+template <size_t N> int pick(const char* const (&names)[N], const std::string& text, const char* what) {
+  std::string all;
+  for (size_t i = 0; i < N; ++i) {
+    if (text == names[i]) return int(i);
+    all += (i ? ", " : "") + std::string(names[i]);
   }
+  throw usage_error(std::string(what) + " " + text + ": give " + all);
+}
+
+constexpr const char* kOutNames[] = {"u8", "u16", "i16", "i32"};
+constexpr int kOutDepths[] = {client::U8, client::U16, client::I16, client::I32};
+
+void parse_ksize(const std::string& text, options& o) {
+  const size_t x = text.find('x');
+  if (x == std::string::npos) {
+    o.kernel_width = o.kernel_height = parse_int(text, "--ksize");
+  } else {
+    o.kernel_width = parse_int(text.substr(0, x), "--ksize");
+    o.kernel_height = parse_int(text.substr(x + 1), "--ksize");
+  }
+  for (int k : {o.kernel_width, o.kernel_height})
+    if (k < 1 || k > 15 || k % 2 == 0)
+      throw usage_error("--ksize " + text + ": each side is odd, 1 to 15 (an even size is served by the next odd one)");
+}
+
+// Every option: the methods that take it and how it sets the options.
+struct option_spec {
+  const char* name;
+  const char* methods;  // space-separated; nullptr: every method
+  bool takes_value;
+  void (*set)(options& o, const std::string& value);
+};
+
+constexpr const char* kArithm = "vadd_mm vsub_mm vmul_mm vdiv_mm vmul_scale vdiv_scale";
+
+const option_spec kOptions[] = {
+    {"--mode", nullptr, true,
+     [](options& o, const std::string& v) {
+       if (!parse_mode(v, o.m)) throw usage_error("--mode " + v + ": give scalar, shvx or dhvx");
+       o.mode_given = true;
+     }},
+    {"--ksize", "boxfilter", true, [](options& o, const std::string& v) { parse_ksize(v, o); }},
+    {"--ddepth", "boxfilter", true, [](options& o, const std::string& v) { o.ddepth = v; }},
+    {"--normalize", "boxfilter", false, [](options& o, const std::string&) { o.normalize = true; }},
+    {"--no-normalize", "boxfilter", false, [](options& o, const std::string&) { o.normalize = false; }},
+    {"--thresh", "thresh", true, [](options& o, const std::string& v) { o.threshold = parse_int(v, "--thresh"); }},
+    {"--max", "thresh", true,
+     [](options& o, const std::string& v) {
+       o.max = parse_int(v, "--max");
+       o.max_given = true;
+     }},
+    {"--op", "thresh", true, [](options& o, const std::string& v) { o.op = uint32_t(pick(kThreshOps, v, "--op")); }},
+    {"--alpha", "convertScaleAbs", true, [](options& o, const std::string& v) { o.alpha = parse_double(v, "--alpha"); }},
+    {"--beta", "convertScaleAbs", true, [](options& o, const std::string& v) { o.beta = parse_double(v, "--beta"); }},
+    {"--scale", "vmul_scale vdiv_scale", true,
+     [](options& o, const std::string& v) { o.scale = parse_int(v, "--scale"); }},
+    {"--out", kArithm, true,
+     [](options& o, const std::string& v) { o.out_depth = kOutDepths[pick(kOutNames, v, "--out")]; }},
+};
+
+job identity_job(const options& o) {
+  auto images = std::make_shared<std::pair<Image, Image>>();
+  images->first = read_png(o.files[0]);
+  const Image& in = images->first;
+  images->second = client::canary_image(in.cols(), in.rows(), in.channels(), in.depth(), in.stride(), 0);
+  job j{"identity", shape_of(in), o.files[1], nullptr, nullptr};
+  j.call = [images] { return client::identity(images->first, images->second); };
+  j.finish = [images, path = o.files[1]](mode) {
+    write_png(path, images->second);
+    return std::string();
+  };
+  return j;
+}
+
+// The ddepth argument from a code (0 to 5) or an element type's name, for this input.
+int parse_ddepth(const std::string& text, const Image& in) {
+  const bool eight_bit = in.depth() == client::U8;
+  int code;
+  if (text.empty()) code = eight_bit ? 0 : 3;
+  else if (text == "u8") code = 0;
+  else if (text == "i16") code = 3;
+  else if (text == "i32") code = 4;
+  else if (text == "f32") code = 5;
+  else code = parse_int(text, "--ddepth");
+  const bool name_fits = !(eight_bit && text == "i32") && !(!eight_bit && (text == "f32" || text == "u8"));
+  if (!name_fits || boxfilter_output_depth(in.depth(), code) < 0)
+    throw usage_error("--ddepth " + text + ": " +
+                      (eight_bit ? "8-bit input gives u8 (0, 1), i16 (2, 3) or f32 (4, 5)"
+                                 : "16-bit input gives i16 (2, 3) or i32 (4, 5)"));
+  return code;
+}
+
+job boxfilter_job(const options& o) {
+  struct images {
+    Image in, ring, out;
+  };
+  auto img = std::make_shared<images>();
+  img->in = read_png(o.files[0]);
+  const int ddepth = parse_ddepth(o.ddepth, img->in);
+  img->out = boxfilter_output(img->in, ddepth);
+  img->ring = boxfilter_ring(img->in, o.kernel_height);
+  job j;
+  j.what = "boxfilter " + std::to_string(o.kernel_width) + "x" + std::to_string(o.kernel_height) + " " +
+           type_name(img->in.depth() == client::U8 ? client::U8 : client::I16) + "->" + type_name(img->out.depth()) +
+           (o.normalize ? " mean" : " sum");
+  j.shape = shape_of(img->in);
+  j.out_path = o.files[1];
+  j.call = [img, ddepth, o] {
+    return client::boxfilter(img->in, ddepth, o.kernel_width, o.kernel_height, o.normalize, img->ring, img->out);
+  };
+  j.finish = [img, path = o.files[1]](mode used) {
+    if (used == Scalar)
+      std::fprintf(stderr, "corvane run: the box filter's Scalar mode writes nothing; the output is all 0\n");
+    write_png(path, png_ready(img->out));
+    return std::string();
+  };
+  return j;
+}
+
+// The methods that run on files: the files they take and an option they cannot do without.
+struct cli_method {
+  const char* name;
+  int number;
+  const char* files;     // for messages; one word a file
+  const char* required;  // nullptr: none
+  job (*prepare)(const options& o);
+};
+
+const cli_method kCliMethods[] = {
+    {"identity", method::identity, "IN.png OUT.png", nullptr, identity_job},
+    {"boxfilter", method::boxfilter, "IN.png OUT.png", nullptr, boxfilter_job},
+    {"thresh", method::thresh, "IN.png OUT.png", "--thresh", thresh_job},
+    {"convertScaleAbs", method::convertScaleAbs, "IN.png OUT.png", nullptr, convert_job},
+    {"vadd_mm", method::vadd_mm, "A.png B.png OUT.png", nullptr, arithm_job},
+    {"vsub_mm", method::vsub_mm, "A.png B.png OUT.png", nullptr, arithm_job},
+    {"vmul_mm", method::vmul_mm, "A.png B.png OUT.png", nullptr, arithm_job},
+    {"vdiv_mm", method::vdiv_mm, "A.png B.png OUT.png", nullptr, arithm_job},
+    {"vmul_scale", method::vmul_scale, "IN.png OUT.png", "--scale", arithm_job},
+    {"vdiv_scale", method::vdiv_scale, "IN.png OUT.png", "--scale", arithm_job},
+    {"hvx_sum", method::hvx_sum, "IN.png", nullptr, sum_job},
+};
+
+bool listed(const char* methods, const std::string& name) {
+  if (methods == nullptr) return true;
+  const std::string padded = std::string(" ") + methods + " ";
+  return padded.find(" " + name + " ") != std::string::npos;
+}
+
+size_t word_count(const std::string& text) {
+  size_t n = 1;
+  for (char c : text) n += c == ' ';
+  return n;
+}
+
+options parse(int argc, char** argv, const cli_method*& row) {
+  options o;
+  std::vector<std::string> positional;
+  std::set<std::string> given;
+  for (int i = 0; i < argc; ++i) {
+    std::string arg = argv[i], value;
+    const bool is_option = arg.size() > 2 && arg.compare(0, 2, "--") == 0;
+    if (!is_option) {
+      positional.push_back(arg);
+      continue;
+    }
+    const size_t eq = arg.find('=');
+    const bool has_inline_value = eq != std::string::npos;
+    if (has_inline_value) {
+      value = arg.substr(eq + 1);
+      arg = arg.substr(0, eq);
+    }
+    const option_spec* spec = nullptr;
+    for (const option_spec& s : kOptions)
+      if (arg == s.name) spec = &s;
+    if (spec == nullptr) throw usage_error("unknown option " + arg);
+    if (!spec->takes_value && has_inline_value) throw usage_error(arg + " takes no value");
+    if (spec->takes_value && !has_inline_value) {
+      if (i + 1 >= argc) throw usage_error(arg + " wants a value");
+      value = argv[++i];
+    }
+    spec->set(o, value);
+    given.insert(arg);
+  }
+  if (positional.empty()) throw usage_error("wants a method and its files");
+  o.method = positional[0];
+  row = nullptr;
+  std::string names;
+  for (const cli_method& m : kCliMethods) {
+    if (o.method == m.name) row = &m;
+    names += (names.empty() ? "" : ", ") + std::string(m.name);
+  }
+  if (row == nullptr) throw usage_error("no method '" + o.method + "' to run on files; these are: " + names);
+  o.files.assign(positional.begin() + 1, positional.end());
+  if (o.files.size() != word_count(row->files))
+    throw usage_error(o.method + " wants " + row->files + " (got " + std::to_string(o.files.size()) + " file(s))");
+  for (const option_spec& s : kOptions)
+    if (given.count(s.name) && !listed(s.methods, o.method))
+      throw usage_error(std::string(s.name) + " is not an option of " + o.method + " (it is one of " + s.methods + ")");
+  if (row->required != nullptr && !given.count(row->required))
+    throw usage_error(o.method + " wants " + row->required);
+  return o;
 }
 
 // The mode a call takes with `units` HVX units among the allowed ones.
@@ -178,75 +305,71 @@ bool settled_mode(unsigned allowed, int units, mode& out) {
   return true;
 }
 
-int run(const options& o) {
-  const int number = o.method == "identity" ? remote::method::identity : remote::method::boxfilter;
-  const unsigned allowed = kMethodModes[number].modes;
+int run(const options& o, const cli_method& row) {
+  const unsigned allowed = kMethodModes[row.number].modes;
   if (o.mode_given && !has(allowed, o.m))
-    throw usage_error(o.method + " has no " + mode_name(o.m) + " mode (" + describe_modes(kMethodModes[number]) + ")");
-
-  const Image in = read_png(o.in_path);
-  Image out;
-  std::string what = o.method;
-  std::function<AEEResult()> call;
-  if (o.method == "identity") {
-    out = client::canary_image(in.cols(), in.rows(), in.channels(), in.depth(), in.stride(), 0);
-    call = [&] { return client::identity(in, out); };
-  } else {
-    const int ddepth = parse_ddepth(o.ddepth, in);
-    out = boxfilter_output(in, ddepth);
-    Image ring = boxfilter_ring(in, o.kernel_height);
-    what += " " + std::to_string(o.kernel_width) + "x" + std::to_string(o.kernel_height) + " " +
-            type_name(in.depth() == client::U8 ? client::U8 : client::I16) + "->" + type_name(out.depth()) +
-            (o.normalize ? " mean" : " sum");
-    call = [&, ddepth, ring]() mutable {
-      return client::boxfilter(in, ddepth, o.kernel_width, o.kernel_height, o.normalize, ring, out);
-    };
-  }
+    throw usage_error(o.method + " has no " + mode_name(o.m) + " mode (" + describe_modes(kMethodModes[row.number]) +
+                      ")");
+  job j = row.prepare(o);
 
   if (o.mode_given) corvane_platform_set_units(units_for(o.m, allowed));
   mode used = Scalar;
   settled_mode(allowed, corvane_platform_units(), used);
   const auto start = std::chrono::steady_clock::now();
-  const AEEResult result = call();
+  const AEEResult result = j.call();
   const double ms = std::chrono::duration<double, std::milli>(std::chrono::steady_clock::now() - start).count();
   corvane_platform_reset();
   if (result != 0) {
-    std::fprintf(stderr, "corvane run: %s answered %d%s; %s not written\n", o.method.c_str(), result,
+    std::fprintf(stderr, "corvane run: %s answered %d%s%s%s\n", o.method.c_str(), result,
                  result == 20 ? " (not built yet)" : result == 4 ? " (arguments not supported)" : "",
-                 o.out_path.c_str());
+                 j.out_path.empty() ? "" : "; ", j.out_path.empty() ? "" : (j.out_path + " not written").c_str());
     return 1;
   }
-  if (o.method == "boxfilter" && used == Scalar)
-    std::fprintf(stderr, "corvane run: the box filter's Scalar mode writes nothing; the output is all 0\n");
-  write_png(o.out_path, png_ready(out));
-  std::printf("%s  %s  %dx%d, %d channel(s): %.3f ms -> %s\n", what.c_str(), mode_name(used), in.cols(), in.rows(),
-              in.channels(), ms, o.out_path.c_str());
+  const std::string after = j.finish(used);
+  std::printf("%s  %s  %s: %.3f ms%s%s\n%s", j.what.c_str(), mode_name(used), j.shape.c_str(), ms,
+              j.out_path.empty() ? "" : " -> ", j.out_path.c_str(), after.c_str());
   return 0;
 }
 
 }  // namespace
 
 void print_run_usage(FILE* out) {
-  std::fprintf(out,
-               "usage: corvane run identity  [--mode M] IN.png OUT.png\n"
-               "       corvane run boxfilter [--ksize WxH] [--ddepth D] [--normalize | --no-normalize] [--mode M]\n"
-               "                             IN.png OUT.png\n"
-               "  IN.png     8-bit or 16-bit PNG, grey, grey+alpha, RGB or RGBA (channels are filtered apart)\n"
-               "  --mode     scalar, shvx or dhvx (default: CORVANE_MODE, else the best the method allows)\n"
-               "  --ksize    odd sides 1 to 15, default 3x3; 5 means 5x5\n"
-               "  --ddepth   output type: u8, i16, f32 for 8-bit input (default u8), i16, i32 for 16-bit input\n"
-               "             (default i16), or the code 0 to 5; 16-bit samples are read as signed\n"
-               "  --no-normalize  write the window's sum instead of its rounded mean\n"
-               "  The box filter counts pixels outside the image as 0; its last H/2 rows stay 0. 16- and\n"
-               "  32-bit outputs are written as 16-bit PNG, rounded and clamped to 0..65535.\n");
+  std::fprintf(
+      out,
+      "usage: corvane run identity  [--mode M] IN.png OUT.png\n"
+      "       corvane run boxfilter [--ksize WxH] [--ddepth D] [--normalize | --no-normalize] [--mode M]\n"
+      "                             IN.png OUT.png\n"
+      "       corvane run thresh --thresh T [--max M] [--op OP] IN.png OUT.png\n"
+      "       corvane run convertScaleAbs [--alpha A] [--beta B] [--mode M] IN.png OUT.png\n"
+      "       corvane run vadd_mm|vsub_mm|vmul_mm|vdiv_mm [--out T] [--mode M] A.png B.png OUT.png\n"
+      "       corvane run vmul_scale|vdiv_scale --scale S [--out T] [--mode M] IN.png OUT.png\n"
+      "       corvane run hvx_sum IN.png\n"
+      "  IN.png     8-bit or 16-bit PNG, grey, grey+alpha, RGB or RGBA (channels are filtered apart)\n"
+      "  --mode     scalar, shvx or dhvx (default: CORVANE_MODE, else the best the method allows)\n"
+      "  --ksize    odd sides 1 to 15, default 3x3; 5 means 5x5\n"
+      "  --ddepth   output type: u8, i16, f32 for 8-bit input (default u8), i16, i32 for 16-bit input\n"
+      "             (default i16), or the code 0 to 5; 16-bit samples are read as signed\n"
+      "  --no-normalize  write the window's sum instead of its rounded mean\n"
+      "  The box filter counts pixels outside the image as 0; its last H/2 rows stay 0. 16- and\n"
+      "  32-bit outputs are written as 16-bit PNG, rounded and clamped to 0..65535.\n"
+      "  thresh: u8 or (16-bit PNG) i16 elements; --op binary (v > T ? M : 0, the default), binary_inv,\n"
+      "             trunc (min(v, T)), tozero (v > T ? v : 0) or tozero_inv; --max default 255 or 32767\n"
+      "  convertScaleAbs: min(|A * x + B|, 255) of i16 elements (8-bit PNG widened), 8-bit output;\n"
+      "             default A 1, B 0\n"
+      "  vadd_mm ... vdiv_scale: the files' bytes as one buffer of u8 or (16-bit PNG) u16 elements; the\n"
+      "             inputs agree in size and type. --out u8, u16, i16 or i32 (default: the input's); the\n"
+      "             vector methods serve the combinations of their tables only (else they answer 4).\n"
+      "             vdiv_scale computes S / element, a zero divisor gives 0\n"
+      "  hvx_sum:   prints each channel's total from the method's lanes and from the host\n");
 }
 
 int run_command(int argc, char** argv) {
   try {
-    options o = parse(argc, argv);
+    const cli_method* row = nullptr;
+    options o = parse(argc, argv, row);
     if (!o.mode_given && !mode_from_environment(o.mode_given, o.m))
       throw usage_error("CORVANE_MODE wants scalar, shvx or dhvx");
-    return run(o);
+    return run(o, *row);
   } catch (const usage_error& e) {
     std::fprintf(stderr, "corvane run: %s\n", e.what());
     print_run_usage(stderr);

@@ -1,9 +1,14 @@
-// `corvane run <method> [options] IN.png OUT.png`: one method on an image file.
+// `corvane run <method> [options] FILES...`: one method on image files.
 #ifndef CORVANE_TOOLS_RUN_H
 #define CORVANE_TOOLS_RUN_H
 
 #include <cstdio>
+#include <functional>
+#include <stdexcept>
+#include <string>
+#include <vector>
 
+#include "client/corvane_client.h"
 #include "tools/method_modes.h"
 
 namespace corvane {
@@ -14,6 +19,61 @@ namespace tools {
 int run_command(int argc, char** argv);
 
 void print_run_usage(FILE* out);
+
+// What run.cpp and run_pixelwise.cpp share.
+namespace run_detail {
+
+struct usage_error : std::runtime_error {
+  using std::runtime_error::runtime_error;
+};
+
+struct options {
+  std::string method;
+  std::vector<std::string> files;  // the words after the method: inputs, then the output
+  bool mode_given = false;
+  mode m = DualHVX;
+  // boxfilter
+  int kernel_width = 3, kernel_height = 3;
+  std::string ddepth;  // empty: the input's own element type
+  bool normalize = true;
+  // thresh
+  int threshold = 0;
+  bool max_given = false;
+  int max = 0;
+  uint32_t op = 0;
+  // convertScaleAbs
+  double alpha = 1.0, beta = 0.0;
+  // the element-wise arithmetic
+  int scale = 0;
+  int out_depth = -1;  // -1: the input's
+};
+
+// One prepared call on images already read: `finish` runs after it answered 0, writes
+// the output and returns lines to print after the report line.
+struct job {
+  std::string what;      // the method and its arguments, for the report line
+  std::string shape;     // the input's size and channels
+  std::string out_path;  // empty: the method writes no file
+  std::function<AEEResult()> call;
+  std::function<std::string(mode used)> finish;
+};
+
+// thresh's operations by number, as --op names them.
+inline constexpr const char* kThreshOps[] = {"binary", "binary_inv", "trunc", "tozero", "tozero_inv"};
+
+int parse_int(const std::string& text, const char* what);
+const char* type_name(int32_t depth);
+std::string shape_of(const client::Image& image);
+// The image as a PNG can hold it: 8-bit and unsigned 16-bit stay, other types become
+// 16-bit samples rounded and clamped to 0..65535.
+client::Image png_ready(const client::Image& out);
+
+job thresh_job(const options& o);
+job convert_job(const options& o);
+job arithm_job(const options& o);
+job sum_job(const options& o);
+
+}  // namespace run_detail
 
 }  // namespace tools
 }  // namespace corvane

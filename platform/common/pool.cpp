@@ -27,8 +27,11 @@ job_queue queue;  // guarded by sim::lock_state; head and tail are also peeked a
 
 // A thread about to sleep on the pool first polls for a while: waking a sleeping thread
 // costs tens of microseconds on a virtual machine, more than many runs take, and the
-// next job or a token's last jobdone usually comes sooner than that.
-constexpr uint64_t kPollMicroseconds = 50;
+// next job or a token's last jobdone usually comes sooner than that. A millisecond
+// covers a caller that does other work between calls of a few hundred microseconds
+// (with 50 or 300 us, a memory-bound 1080p kernel alternating with OpenCV calls took
+// 1.2x to 1.8x its own time; with 1 ms, 1.0x).
+constexpr uint64_t kPollMicroseconds = 1000;
 
 template <class Ready> void poll_before_sleeping(Ready ready) {
   const uint64_t until = sim::now_us() + kPollMicroseconds;

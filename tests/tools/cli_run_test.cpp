@@ -4,9 +4,11 @@
 #include <stdlib.h>
 #include <sys/wait.h>
 
+#include <algorithm>
 #include <cstdio>
 #include <cstring>
 #include <fstream>
+#include <initializer_list>
 #include <iterator>
 #include <string>
 
@@ -134,6 +136,104 @@ TEST_F(CliRun, BoxFilterWritesAMeanOrSaysItIsNotBuilt) {
   // Inside, a window of 100s has mean 100; the last row is not written and stays 0.
   EXPECT_EQ(100, out.row(10)[150]);
   EXPECT_EQ(0, out.row(19)[150]);
+}
+
+// Writes a PNG of `cols` x `rows` pixels of `channels` samples, given row after row.
+void write_samples(const std::string& path, int cols, int rows, int channels, int32_t depth,
+                   std::initializer_list<int> samples) {
+  Image img(cols, rows, channels, depth);
+  const int per_row = cols * channels;
+  int i = 0;
+  for (int v : samples) {
+    uint8_t* row = img.row(i / per_row);
+    if (depth == corvane::client::U8) row[i % per_row] = uint8_t(v);
+    else reinterpret_cast<uint16_t*>(row)[i % per_row] = uint16_t(v);
+    ++i;
+  }
+  corvane::tools::write_png(path, img);
+}
+
+TEST_F(CliRun, PixelwiseMethodsTakeTheirOptionsAndFiles) {
+  write_samples(path("a.png"), 5, 2, 1, corvane::client::U8, {10, 100, 101, 200, 0, 255, 99, 100, 150, 3});
+  write_samples(path("b.png"), 5, 2, 1, corvane::client::U8, {250, 100, 1, 2, 3, 1, 2, 3, 4, 0});
+  write_samples(path("rgb.png"), 2, 1, 3, corvane::client::U8, {1, 2, 3, 10, 20, 30});
+  write_samples(path("rgb16.png"), 2, 1, 3, corvane::client::U16, {1, 2, 3, 10, 20, 30});
+  Image big(70, 3, 3, corvane::client::U8), g16(85, 3, 1, corvane::client::U16);
+  big.fill_random(3);
+  g16.fill_random(4);
+  corvane::tools::write_png(path("big.png"), big);
+  corvane::tools::write_png(path("g16.png"), g16);
+  const std::string a = path("a.png"), b = path("b.png"), out = path("out.png");
+  const std::string ab = a + " " + b + " " + out, a_out = a + " " + out;
+  const struct {
+    std::string args;
+    int status;
+    std::string says;  // a line the output must hold
+  } table[] = {
+      {"thresh --thresh 1000 --op trunc " + path("g16.png") + " " + out, 0, "DualHVX"},
+      {"thresh --thresh=5 --op tozero_inv " + path("big.png") + " " + out, 0, ""},
+      {"convertScaleAbs --alpha 2 --beta -3 " + a_out, 0, "DualHVX"},
+      {"convertScaleAbs --mode scalar --alpha 0.01 " + path("g16.png") + " " + out, 0, "Scalar"},
+      {"convertScaleAbs --mode shvx " + path("big.png") + " " + out, 0, "SingleHVX"},
+      {"vadd_mm --out u16 " + ab, 0, "u8->u16"},
+      {"vsub_mm --out i32 " + path("g16.png") + " " + path("g16.png") + " " + out, 0, "u16->i32"},
+      {"vmul_mm --out u16 " + path("big.png") + " " + path("big.png") + " " + out, 0, ""},
+      {"vdiv_mm --out i16 " + ab, 0, "Scalar"},
+      {"vmul_scale --scale 3 " + path("big.png") + " " + out, 0, ""},
+      {"vdiv_scale --scale 300 --out u16 " + a_out, 0, ""},
+      {"hvx_sum " + path("rgb.png"), 0, "channel 1: 22 (uint32 of the lanes), 22 (host)"},
+      {"hvx_sum " + path("rgb16.png"), 0, "channel 2: 33 (uint32 of the lanes), 33 (host)"},
+      {"thresh " + a_out, 2, "wants --thresh"},
+      {"thresh --thresh 1 --op median " + a_out, 2, ""},
+      {"thresh --thresh 1 --mode shvx " + a_out, 2, "no SingleHVX mode"},
+      {"thresh --thresh x " + a_out, 2, ""},
+      {"convertScaleAbs --alpha nan " + a_out, 2, ""},
+      {"convertScaleAbs --scale 2 " + a_out, 2, "not an option of convertScaleAbs"},
+      {"vadd_mm " + a_out, 2, "wants A.png B.png OUT.png"},
+      {"vadd_mm --out f32 " + ab, 2, ""},
+      {"vadd_mm --out i32 " + ab, 1, "answered 4"},
+      {"vadd_mm " + a + " " + path("big.png") + " " + out, 1, "differ"},
+      {"vdiv_mm --mode dhvx " + ab, 2, ""},
+      {"vmul_scale " + a_out, 2, "wants --scale"},
+      {"hvx_sum " + a_out, 2, ""},
+      {"hvx_sum --out u8 " + a, 2, ""},
+  };
+  for (const auto& t : table) {
+    SCOPED_TRACE("corvane run " + t.args);
+    std::ofstream(out) << "precious";
+    EXPECT_EQ(t.status, cli("run " + t.args)) << output_;
+    EXPECT_NE(std::string::npos, output_.find(t.says)) << output_;
+    const bool writes = t.status == 0 && t.args.find(out) != std::string::npos;
+    EXPECT_EQ(!writes, bytes("out.png") == "precious");
+  }
+}
+
+TEST_F(CliRun, ThreshAndAddGiveTheElementsOfTheirFormulas) {
+  // Binary at 100, max 7; 16-bit samples as signed: 65535 is -1, not above 4, so to zero gives 0.
+  write_samples(path("a.png"), 5, 2, 1, corvane::client::U8, {10, 100, 101, 200, 0, 255, 99, 100, 150, 3});
+  write_samples(path("s.png"), 3, 1, 1, corvane::client::U16, {65535, 5, 300});
+  ASSERT_EQ(0, cli("run thresh --thresh 100 --max 7 " + path("a.png") + " " + path("t.png"))) << output_;
+  ASSERT_EQ(0, cli("run thresh --thresh 4 --op tozero " + path("s.png") + " " + path("t16.png"))) << output_;
+  const Image t = corvane::tools::read_png(path("t.png")), t16 = corvane::tools::read_png(path("t16.png"));
+  const uint8_t want[2][5] = {{0, 0, 7, 7, 0}, {7, 0, 0, 7, 0}};
+  for (int y = 0; y < 2; ++y) EXPECT_EQ(0, std::memcmp(want[y], t.row(y), 5)) << "row " << y;
+  const uint16_t* r16 = reinterpret_cast<const uint16_t*>(t16.row(0));
+  EXPECT_EQ(0, r16[0]);
+  EXPECT_EQ(5, r16[1]);
+  EXPECT_EQ(300, r16[2]);
+
+  // 630 bytes: the last vector is padded, and the padding's sums are dropped.
+  Image x(70, 3, 3, corvane::client::U8), y(70, 3, 3, corvane::client::U8);
+  x.fill_random(7);
+  y.fill_random(8);
+  corvane::tools::write_png(path("x.png"), x);
+  corvane::tools::write_png(path("y.png"), y);
+  ASSERT_EQ(0, cli("run vadd_mm " + path("x.png") + " " + path("y.png") + " " + path("sum.png"))) << output_;
+  const Image sum = corvane::tools::read_png(path("sum.png"));
+  ASSERT_EQ(70, sum.cols());
+  for (int r = 0; r < 3; ++r)
+    for (size_t i = 0; i < x.row_bytes(); ++i)
+      ASSERT_EQ(std::min(x.row(r)[i] + y.row(r)[i], 255), sum.row(r)[i]) << "row " << r << " byte " << i;
 }
 
 TEST_F(CliRun, MethodsListsEveryMethodWithItsModes) {
