@@ -36,7 +36,7 @@ class ExecutorBase : public ParallelLoop {
   // The task of `count` vectors that starts `offset` input vectors in: its inputs are
   // fetched into L2 first, then Op runs once per step.
   template <class Op, bool Prefetch, class Step>
-  static void run_task(const vec* in1, const vec* in2, vec* out, size_t offset, unsigned count, Step step) {
+  CORVANE_FLAT static void run_task(const vec* in1, const vec* in2, vec* out, size_t offset, unsigned count, Step step) {
     in1 += offset * Op::input_step();
     if (in2 != nullptr) in2 += offset * Op::input_step();
     out += offset * Op::output_step();

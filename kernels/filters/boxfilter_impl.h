@@ -25,10 +25,8 @@ namespace cv {
 namespace adsp {
 namespace box {
 
-// The row loop is flattened: every vector step in it is inlined, whatever the size of
-// the unit (twice 160 row loops in one), since as calls their vector arguments and
-// results would go through memory and the align distances would no longer be constants.
-#define CORVANE_BOX_FLAT __attribute__((flatten))
+// The row loops are flattened (CORVANE_FLAT): twice 160 of them share one unit, and as
+// calls their steps would pass vectors through memory and lose their constant distances.
 
 // The lanes of a family in mode M: an input vector, and its sums as a pair of vectors
 // of twice-as-wide lanes in pixel order (lo holds the first half of the pixels).
@@ -130,7 +128,7 @@ inline void store_out(hvx::gen_vec<M>* dst, int j, const hvx::wvi32_t<M>& sum, h
 // the member. Channels is the input's channel count when it is known here (1), so that
 // the taps' distances are constants, or 0 to read it from the descriptor.
 template <hvx::mode_enum M, int InputBytes, int W, class Out, bool Norm, int Channels>
-CORVANE_BOX_FLAT void filter_rows_of(gen_in& _input, gen_out& _buffer, gen_out& _output, const int H,
+CORVANE_FLAT void filter_rows_of(gen_in& _input, gen_out& _buffer, gen_out& _output, const int H,
                                      const int16_t norm) {
   typedef hvx::gen_vec<M> vec;
   typedef typename lanes_c<M, InputBytes>::sum_t sum_t;
@@ -202,7 +200,6 @@ void filter_rows(gen_in& _input, gen_out& _buffer, gen_out& _output, const int H
     filter_rows_of<M, InputBytes, W, Out, Norm, 0>(_input, _buffer, _output, H, norm);
 }
 
-#undef CORVANE_BOX_FLAT
 
 }  // namespace box
 

@@ -37,7 +37,7 @@ template <hvx::mode_enum M> struct scaler {
 }  // namespace convert_detail
 
 template <hvx::mode_enum M, int Isa>
-AEEResult convertScaleAbs<M, Isa>::run(hvx::for_mode<M> mode, gen_in _input, gen_out _output, double alpha,
+CORVANE_FLAT AEEResult convertScaleAbs<M, Isa>::run(hvx::for_mode<M> mode, gen_in _input, gen_out _output, double alpha,
                                        double beta) {
   hvx::mode_lock guard = hvx::adopt_lock(mode);
   typedef hvx::gen_vec<M> vec;

@@ -210,7 +210,7 @@ template <class T> struct sum4c_16 {
 
 typedef int HvxSumFunc(const uint8_t* src, int srcLen, int32_t* dst);
 
-template <class Group> int block_sum(const uint8_t* src, int srcLen, int32_t* dst) {
+template <class Group> CORVANE_FLAT int block_sum(const uint8_t* src, int srcLen, int32_t* dst) {
   constexpr size_t E = sizeof(typename Group::lane), per_vector = N / E, per_group = Group::G * per_vector;
   const size_t n = E == 1 ? static_cast<unsigned>(srcLen) : static_cast<unsigned>(srcLen) >> 1;
   const vec* v = reinterpret_cast<const vec*>(src);

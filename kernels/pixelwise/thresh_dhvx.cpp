@@ -29,7 +29,7 @@ typedef void HvxThreshFunc(const in<vec>& input, const out<vec>& output, int32_t
 // `rows` rows from first_row, two at a time, each ceil(cols * channels / elements per
 // vector) whole vectors; the last vector of a row is filtered whole.
 template <class V, int Op>
-void threshold_rows(const in<vec>& input, const out<vec>& output, int32_t max, int32_t threshold, int first_row,
+CORVANE_FLAT void threshold_rows(const in<vec>& input, const out<vec>& output, int32_t max, int32_t threshold, int first_row,
                     int rows) {
   const V t = vcast<V>(vsplat<vi32_t<DualHVX>>(threshold)), m = vcast<V>(vsplat<vi32_t<DualHVX>>(max)),
           z = vzero<V>();
