@@ -11,6 +11,7 @@ AEEResult convertScaleAbs<hvx::Scalar>::run(hvx::for_mode<hvx::Scalar>, gen_in _
   in<uint8_t> input(_input);
   out<uint8_t> output(_output);
   const float a = static_cast<float>(alpha), b = static_cast<float>(beta);
+  if (input.cols() <= 0) return hvx::RESULT_OK;  // rows of no width: do not walk them
   for (int row = 0; row < input.rows(); ++row) {
     // Rows start a whole number of elements apart, as a view of int16_t walks them.
     const uint8_t* x = input.begin() + static_cast<size_t>(row) * (input.stride_bytes() / 2 * 2);

@@ -217,6 +217,10 @@ TEST(Boundary, RowsOfNoWidthEndAtOnce) {
     corvane_mbuf empty{nullptr, 0};
     EXPECT_EQ(0, corvane_boxfilter(&in, &empty, 0, 5, 3, 1, &other, &empty, &other, &empty)) << units << " units";
   }
+  test::ScopedUnits scalar(0);
+  const corvane_mbufd in{0, 0, INT_MAX, 1, 3, 0, 0, 0, 0};
+  corvane_mbuf empty{nullptr, 0};
+  EXPECT_EQ(0, corvane_convertScaleAbs(&in, &in, &empty, &empty, 1.0, 0.0));
 }
 
 }  // namespace
