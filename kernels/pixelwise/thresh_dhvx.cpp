@@ -76,7 +76,7 @@ class ThreshLoop : public ParallelLoop {
     return 0;
   }
   bool body(unsigned worker_id, unsigned) override {
-    const int rows = src.rows(), half = rows / 2;
+    const int rows = nstd::max(src.rows(), 0), half = rows / 2;  // negative rows: nothing to do
     if (worker_id == 0) fun(src, dst, max, threshold, 0, workers == 1 ? rows : half);
     if (worker_id == 1) fun(src, dst, max, threshold, half, rows - half);
     return true;

@@ -221,6 +221,9 @@ TEST(Boundary, RowsOfNoWidthEndAtOnce) {
   const corvane_mbufd in{0, 0, INT_MAX, 1, 3, 0, 0, 0, 0};
   corvane_mbuf empty{nullptr, 0};
   EXPECT_EQ(0, corvane_convertScaleAbs(&in, &in, &empty, &empty, 1.0, 0.0));
+  test::ScopedUnits dual(4);  // negative rows: no rows, and no row -2 for the second worker
+  const corvane_mbufd negative{256, 256, -5, 1, 0, 0, 0, 0, 0};
+  EXPECT_EQ(0, corvane_thresh(&negative, &empty, &negative, &empty, 1, 2, 0));
 }
 
 }  // namespace
