@@ -25,23 +25,23 @@ fixed_scale choose_fixed_scale(double alpha, double beta);
 template <hvx::mode_enum M, int Isa = hvx::this_isa> struct convertScaleAbs {
   static AEEResult run(hvx::for_mode<M> mode, gen_in input, gen_out output, double alpha, double beta);
 
-  // Scalar: `cols` elements a row. Vector modes: a row's whole stride, rounded down to
-  // vectors (at least one), in; half as many vectors, rounded up, out; strides are whole
-  // vectors. The input's rows count for both.
+  // Scalar: `cols` elements a row. Vector modes: a row's whole stride in, as vectors;
+  // half as many vectors, rounded up, out; strides are whole vectors, and a stride of no
+  // vector converts nothing. The input's rows count for both; rows that overlap (a
+  // stride shorter than the row) describe no image and are refused in every mode.
   static hvx::reach reach(const gen_in& input, const gen_out& output, double, double) {
-    const int64_t rows = nstd::max(input.rows(), 0);
+    const int64_t rows = nstd::max(input.rows(), 0), cols = input.cols();
     hvx::reach r;
-    r.refuse_if(input.stride_bytes() < 0 || output.stride_bytes() < 0 || input.cols() < 0);
+    r.refuse_if(input.stride_bytes() < 0 || output.stride_bytes() < 0 || cols < 0);
+    r.refuse_if(rows > 1 && (input.stride_bytes() < 2 * cols || output.stride_bytes() < cols));
     if (M == hvx::Scalar) {
-      const int64_t cols = input.cols();
       return r.rows(input.buffer, rows, input.stride_bytes() / 2 * 2, 2 * cols)
           .rows(output.buffer, rows, output.stride_bytes(), cols);
     }
     constexpr int64_t V = hvx::mode_align<M>;
     r.refuse_if(input.stride_bytes() % V != 0 || output.stride_bytes() % V != 0);  // rows are walked in vectors
-    const int64_t n = nstd::max<int64_t>(input.stride_bytes() / V, 1);
-    return r.rows(input.buffer, rows, input.stride_bytes() / V * V, n * V, V)
-        .rows(output.buffer, rows, output.stride_bytes() / V * V, hvx::div_up(n, 2) * V, V);
+    const int64_t n = input.stride_bytes() / V;
+    return r.rows(input.buffer, rows, n * V, n * V, V).rows(output.buffer, rows, output.stride_bytes(), hvx::div_up(n, 2) * V, V);
   }
 };
 

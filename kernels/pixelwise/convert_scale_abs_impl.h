@@ -45,7 +45,7 @@ CORVANE_FLAT AEEResult convertScaleAbs<M, Isa>::run(hvx::for_mode<M> mode, gen_i
   in<vec> input(_input);
   out<vec> output(_output);
   const int rows = input.rows();
-  if (rows <= 0) return hvx::RESULT_OK;
+  if (rows <= 0 || input.stride_vectors() == 0) return hvx::RESULT_OK;
   const convert_detail::scaler<M> scale(choose_fixed_scale(alpha, beta));
   const int in_stride = static_cast<int>(input.stride_vectors());
   const int out_stride = static_cast<int>(output.stride_vectors());
