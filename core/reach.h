@@ -38,6 +38,14 @@ inline int64_t image_bytes(const InOutPtrBase& view) {
   return view.stride_bytes() < 0 || view.rows() < 0 ? -1 : sat_mul(view.stride_bytes(), view.rows());
 }
 
+// A memory record for a buffer given as a pointer and a length in bytes (functions over
+// flat buffers), so that its reach is checked like an image's. A length past the int
+// range is held at INT32_MAX; a negative one stays negative, which no region fits.
+inline corvane_mbuf flat_buffer(const void* p, int64_t bytes) {
+  return corvane_mbuf{static_cast<unsigned char*>(const_cast<void*>(p)),
+                      static_cast<int>(bytes > INT32_MAX ? INT32_MAX : bytes < INT32_MIN ? INT32_MIN : bytes)};
+}
+
 // The alignment of a mode's vector loads and stores; 1 in Scalar.
 template <mode_enum M> constexpr int64_t mode_align = M == Scalar ? 1 : static_cast<int64_t>(mode_vector_bytes<M>);
 

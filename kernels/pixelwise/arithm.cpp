@@ -10,8 +10,6 @@ namespace {
 
 using namespace hvx::arithm;
 
-corvane_mbuf as_mbuf(const uint8_t* p, int len) { return corvane_mbuf{const_cast<uint8_t*>(p), len}; }
-
 // N = the longer input's whole vectors; only the entries of the table are served.
 AEEResult vector_op(table_id t, const uint8_t* src1, int src1Len, int d1, const uint8_t* src2, int src2Len, int d2,
                     uint8_t* dst, int dstLen, int d3, int32_t scale = 0) {
@@ -20,7 +18,7 @@ AEEResult vector_op(table_id t, const uint8_t* src1, int src1Len, int d1, const 
   const int step = d1 > 4 || d2 > 4 || d3 > 4 ? 0 : output_step(t, d1, d2, d3);
   if (step == 0) return hvx::RESULT_UNSUPPORTED;
   const int64_t N = nstd::max(nstd::max(src1Len, src2Len), 0) / 64;
-  const corvane_mbuf in1 = as_mbuf(src1, src1Len), in2 = as_mbuf(src2, src2Len), out = as_mbuf(dst, dstLen);
+  const corvane_mbuf in1 = hvx::flat_buffer(src1, src1Len), in2 = hvx::flat_buffer(src2, src2Len), out = hvx::flat_buffer(dst, dstLen);
   if (!flat_reach(in1, t == MUL_SCALE ? nullptr : &in2, out, N, step).fits()) return hvx::RESULT_BAD_POINTER;
   hvx::on_host_isa([&](auto isa) {
     constexpr int level = decltype(isa)::value;
@@ -92,7 +90,7 @@ AEEResult divide(bool by_scale, const uint8_t* src1, int src1Len, int d1, const 
   if (d1 > 7 || d2 > 7 || d3 > 7) return hvx::RESULT_UNSUPPORTED;
   const int e1 = element_bytes(d1), e2 = element_bytes(d2), e3 = element_bytes(d3);
   const int64_t count = hvx::div_up(src1Len, e1);
-  const corvane_mbuf in1 = as_mbuf(src1, src1Len), in2 = as_mbuf(src2, src2Len), out = as_mbuf(dst, dstLen);
+  const corvane_mbuf in1 = hvx::flat_buffer(src1, src1Len), in2 = hvx::flat_buffer(src2, src2Len), out = hvx::flat_buffer(dst, dstLen);
   hvx::reach r;
   r.bytes(&in1, count * e1).bytes(&out, count * e3);
   if (!by_scale) r.bytes(&in2, count * e2);

@@ -93,32 +93,35 @@ template <class Op> void scalarop_loop(const vec* v, int32_t scale, vec* out, un
   (void)loop.run(0);
 }
 
+// The loop that runs Op for a table of F: two inputs, or one input and the scale.
+template <class F, class Op> constexpr F* loop_of() {
+  if constexpr (nstd::is_same_c<F, binary_op>::value) {
+    return &binop_loop<Op>;
+  } else {
+    return &scalarop_loop<Op>;
+  }
+}
+
 // [d1][d2][d3] of every entry of List, the operation Op on its lanes.
 template <class F> struct table {
   F* f[5][5][5];
 };
-template <template <class, class, class> class Op, class List, size_t... I>
-constexpr table<binary_op> binary_table(nstd::integer_sequence<size_t, I...>) {
-  table<binary_op> t{};
+template <class F, template <class, class, class> class Op, class List, size_t... I>
+constexpr table<F> fill_table(nstd::integer_sequence<size_t, I...>) {
+  table<F> t{};
   ((t.f[List::list[I].d1][List::list[I].d2][List::list[I].d3] =
-        &binop_loop<Op<lane<List::list[I].d1>, lane<List::list[I].d2>, lane<List::list[I].d3>>>),
+        loop_of<F, Op<lane<List::list[I].d1>, lane<List::list[I].d2>, lane<List::list[I].d3>>>()),
    ...);
   return t;
 }
-template <template <class, class, class> class Op, class List, size_t... I>
-constexpr table<scale_op> scale_table(nstd::integer_sequence<size_t, I...>) {
-  table<scale_op> t{};
-  ((t.f[List::list[I].d1][List::list[I].d2][List::list[I].d3] =
-        &scalarop_loop<Op<lane<List::list[I].d1>, lane<List::list[I].d2>, lane<List::list[I].d3>>>),
-   ...);
-  return t;
+template <class F, template <class, class, class> class Op, class List> constexpr table<F> make_table() {
+  return fill_table<F, Op, List>(nstd::make_integer_sequence<size_t, sizeof(List::list) / sizeof(entry)>{});
 }
-template <class List> constexpr auto entries = nstd::make_integer_sequence<size_t, sizeof(List::list) / sizeof(entry)>{};
 
-constexpr table<binary_op> ADD_TABLE = binary_table<add_op, add_sub_entries>(entries<add_sub_entries>);
-constexpr table<binary_op> SUB_TABLE = binary_table<sub_op, add_sub_entries>(entries<add_sub_entries>);
-constexpr table<binary_op> MUL_TABLE = binary_table<mul_op, mul_entries>(entries<mul_entries>);
-constexpr table<scale_op> MUL_SCALE_TABLE = scale_table<muls_op, mul_entries>(entries<mul_entries>);
+constexpr table<binary_op> ADD_TABLE = make_table<binary_op, add_op, add_sub_entries>();
+constexpr table<binary_op> SUB_TABLE = make_table<binary_op, sub_op, add_sub_entries>();
+constexpr table<binary_op> MUL_TABLE = make_table<binary_op, mul_op, mul_entries>();
+constexpr table<scale_op> MUL_SCALE_TABLE = make_table<scale_op, muls_op, mul_entries>();
 
 }  // namespace
 

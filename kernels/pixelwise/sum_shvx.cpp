@@ -22,7 +22,7 @@ constexpr int N = static_cast<int>(mode_vector_bytes<M>);  // 64
 typedef gen_vec<M> vec;
 typedef vu8_t<M> vu8;
 typedef vi32_t<M> vi32;
-typedef int32_t lanes16[16];
+typedef uint32_t lanes16[16];  // folded on the scalar core, where unsigned sums wrap as the lanes do
 
 // Bytes from p in the first `bytes` bytes of v, zeros after.
 inline vec partial(const vec* p, size_t bytes) {
@@ -31,7 +31,7 @@ inline vec partial(const vec* p, size_t bytes) {
   return v;
 }
 
-inline void store(const vi32& v, int32_t* out) { __builtin_memcpy(out, &v, sizeof(v)); }
+inline void store(const vi32& v, void* out) { __builtin_memcpy(out, &v, sizeof(v)); }
 
 // ---- 8-bit groups ----------------------------------------------------------------------
 
@@ -44,7 +44,7 @@ struct sum1c_u8 {
     const auto w = vadd_w(hi(h), lo(h));
     acc = vadd(acc, vadd(hi(w), lo(w)));
   }
-  void fold(int32_t* out) const { store(acc, out); }
+  void fold(uint32_t* out) const { store(acc, out); }
 };
 
 struct sum2c_u8 {
@@ -57,13 +57,13 @@ struct sum2c_u8 {
     first = vadd(first, vadd(hi(c0), lo(c0)));
     second = vadd(second, vadd(hi(c1), lo(c1)));
   }
-  void fold(int32_t* out) const {
+  void fold(uint32_t* out) const {
     lanes16 f, s;
     store(first, f);
     store(second, s);
     for (int j = 0; j < 8; ++j) {
-      out[j] = static_cast<int32_t>(static_cast<uint32_t>(f[j]) + static_cast<uint32_t>(f[j + 8]));
-      out[j + 8] = static_cast<int32_t>(static_cast<uint32_t>(s[j]) + static_cast<uint32_t>(s[j + 8]));
+      out[j] = f[j] + f[j + 8];
+      out[j + 8] = s[j] + s[j + 8];
     }
   }
 };
@@ -86,30 +86,24 @@ struct sum3c_u8 {
     acc1 = vadd(acc1, lo(wa));                // 4k + 1: channel (k + 1) mod 3
     acc2 = vadd(acc2, hi(wb));                // 4k + 2: channel (k + 2) mod 3
   }
-  void fold(int32_t* out) const {
+  void fold(uint32_t* out) const {
     lanes16 a1, a2, a3;
     store(acc1, a1);
     store(acc2, a2);
     store(acc3, a3);
-    for (int j = 0; j < 16; ++j) {
-      uint32_t s = static_cast<uint32_t>(a3[j]);
-      if (j < 15) s += static_cast<uint32_t>(a2[j + 1]);
-      if (j >= 1) s += static_cast<uint32_t>(a1[j - 1]);
-      out[j] = static_cast<int32_t>(s);
-    }
-    out[14] = static_cast<int32_t>(static_cast<uint32_t>(out[14]) + static_cast<uint32_t>(a2[0]));
-    out[1] = static_cast<int32_t>(static_cast<uint32_t>(out[1]) + static_cast<uint32_t>(a1[15]));
+    for (int j = 0; j < 16; ++j) out[j] = a3[j] + (j < 15 ? a2[j + 1] : 0) + (j >= 1 ? a1[j - 1] : 0);
+    out[14] += a2[0];
+    out[1] += a1[15];
   }
 };
 
 // Quarter c of the result: the four quarters of acc[c] added, lane by lane.
-inline void fold_quarters(const vi32 (&acc)[4], int32_t* out) {
+inline void fold_quarters(const vi32 (&acc)[4], uint32_t* out) {
   for (int c = 0; c < 4; ++c) {
     lanes16 a;
     store(acc[c], a);
     for (int l = 0; l < 4; ++l)
-      out[4 * c + l] = static_cast<int32_t>(static_cast<uint32_t>(a[l]) + static_cast<uint32_t>(a[4 + l]) +
-                                            static_cast<uint32_t>(a[8 + l]) + static_cast<uint32_t>(a[12 + l]));
+      out[4 * c + l] = a[l] + a[4 + l] + a[8 + l] + a[12 + l];
   }
 }
 
@@ -125,7 +119,7 @@ struct sum4c_u8 {
     acc[1] = vadd(acc[1], lo(odd));
     acc[3] = vadd(acc[3], hi(odd));
   }
-  void fold(int32_t* out) const { fold_quarters(acc, out); }
+  void fold(uint32_t* out) const { fold_quarters(acc, out); }
 };
 
 // ---- 16-bit groups: T is uint16_t or int16_t, which widen with zeros or the sign -------
@@ -140,7 +134,7 @@ template <class T> struct sum1c_16 {
     const auto w = vadd_w(v16<T>(in[0]), v16<T>(in[1]));
     acc = vadd(acc, vadd(hi(w), lo(w)));
   }
-  void fold(int32_t* out) const { store(acc, out); }
+  void fold(uint32_t* out) const { store(acc, out); }
 };
 
 template <class T> struct sum2c_16 {
@@ -152,7 +146,7 @@ template <class T> struct sum2c_16 {
     halves.first = vadd(halves.first, lo(w));
     halves.second = vadd(halves.second, hi(w));
   }
-  void fold(int32_t* out) const { halves.fold(out); }
+  void fold(uint32_t* out) const { halves.fold(out); }
 };
 
 // Three vectors are 96 elements; element position p of A, B, C and D holds channel p mod 3.
@@ -173,13 +167,13 @@ template <class T> struct sum3c_16 {
     acc1 = vadd(acc1, vadd(lo(w1), lo(w2)));  // word lane k: position 2k
     acc2 = vadd(acc2, vadd(hi(w1), hi(w2)));  // position 2k + 1
   }
-  void fold(int32_t* out) const {
+  void fold(uint32_t* out) const {
     lanes16 a1, a2;
     store(acc1, a1);
     store(acc2, a2);
     for (int j = 0; j < 16; ++j)
-      out[j] = static_cast<int32_t>(static_cast<uint32_t>(a1[j]) + (j < 15 ? static_cast<uint32_t>(a2[j + 1]) : 0u));
-    out[14] = static_cast<int32_t>(static_cast<uint32_t>(out[14]) + static_cast<uint32_t>(a2[0]));
+      out[j] = a1[j] + (j < 15 ? a2[j + 1] : 0);
+    out[14] += a2[0];
   }
 };
 
@@ -193,15 +187,15 @@ template <class T> struct sum4c_16 {
     acc01 = vadd(acc01, vadd(lo(w1), lo(w2)));
     acc23 = vadd(acc23, vadd(hi(w1), hi(w2)));
   }
-  void fold(int32_t* out) const {
+  void fold(uint32_t* out) const {
     lanes16 a, b;
     store(acc01, a);
     store(acc23, b);
     for (int l = 0; l < 4; ++l) {
-      out[l] = static_cast<int32_t>(static_cast<uint32_t>(a[l]) + static_cast<uint32_t>(a[4 + l]));
-      out[4 + l] = static_cast<int32_t>(static_cast<uint32_t>(a[8 + l]) + static_cast<uint32_t>(a[12 + l]));
-      out[8 + l] = static_cast<int32_t>(static_cast<uint32_t>(b[l]) + static_cast<uint32_t>(b[4 + l]));
-      out[12 + l] = static_cast<int32_t>(static_cast<uint32_t>(b[8 + l]) + static_cast<uint32_t>(b[12 + l]));
+      out[l] = a[l] + a[4 + l];
+      out[4 + l] = a[8 + l] + a[12 + l];
+      out[8 + l] = b[l] + b[4 + l];
+      out[12 + l] = b[8 + l] + b[12 + l];
     }
   }
 };
@@ -223,7 +217,9 @@ template <class Group> CORVANE_FLAT int block_sum(const uint8_t* src, int srcLen
     if (const size_t tail = rem % per_vector) last[full] = partial(v + full, tail * E);
     g.add(last);
   }
-  g.fold(dst);
+  lanes16 folded;
+  g.fold(folded);
+  __builtin_memcpy(dst, folded, sizeof(folded));
   return 0;
 }
 
