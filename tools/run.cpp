@@ -119,7 +119,7 @@ void parse_ksize(const std::string& text, options& o) {
 }
 
 // Every option: the methods that take it and how it sets the options.
-struct option_spec {
+struct option_row {
   const char* name;
   const char* methods;  // space-separated; nullptr: every method
   bool takes_value;
@@ -128,7 +128,7 @@ struct option_spec {
 
 constexpr const char* kArithm = "vadd_mm vsub_mm vmul_mm vdiv_mm vmul_scale vdiv_scale";
 
-const option_spec kOptions[] = {
+const option_row kOptions[] = {
     {"--mode", nullptr, true,
      [](options& o, const std::string& v) {
        if (!parse_mode(v, o.m)) throw usage_error("--mode " + v + ": give scalar, shvx or dhvx");
@@ -264,16 +264,16 @@ options parse(int argc, char** argv, const cli_method*& row) {
       value = arg.substr(eq + 1);
       arg = arg.substr(0, eq);
     }
-    const option_spec* spec = nullptr;
-    for (const option_spec& s : kOptions)
-      if (arg == s.name) spec = &s;
-    if (spec == nullptr) throw usage_error("unknown option " + arg);
-    if (!spec->takes_value && has_inline_value) throw usage_error(arg + " takes no value");
-    if (spec->takes_value && !has_inline_value) {
+    const option_row* known = nullptr;
+    for (const option_row& row : kOptions)
+      if (arg == row.name) known = &row;
+    if (known == nullptr) throw usage_error("unknown option " + arg);
+    if (!known->takes_value && has_inline_value) throw usage_error(arg + " takes no value");
+    if (known->takes_value && !has_inline_value) {
       if (i + 1 >= argc) throw usage_error(arg + " wants a value");
       value = argv[++i];
     }
-    spec->set(o, value);
+    known->set(o, value);
     given.insert(arg);
   }
   if (positional.empty()) throw usage_error("wants a method and its files");
@@ -288,7 +288,7 @@ options parse(int argc, char** argv, const cli_method*& row) {
   o.files.assign(positional.begin() + 1, positional.end());
   if (o.files.size() != word_count(row->files))
     throw usage_error(o.method + " wants " + row->files + " (got " + std::to_string(o.files.size()) + " file(s))");
-  for (const option_spec& s : kOptions)
+  for (const option_row& s : kOptions)
     if (given.count(s.name) && !listed(s.methods, o.method))
       throw usage_error(std::string(s.name) + " is not an option of " + o.method + " (it is one of " + s.methods + ")");
   if (row->required != nullptr && !given.count(row->required))
