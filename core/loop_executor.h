@@ -33,24 +33,16 @@ class ExecutorBase : public ParallelLoop {
  protected:
   ~ExecutorBase() = default;
 
-  // The task of `count` vectors that starts `offset` input vectors in: its inputs are
-  // fetched into L2 first, then Op runs once per step.
+  // The `count` steps from step `first`: the inputs they read (in2 may be null) are
+  // fetched into L2 first, then step(k) runs for each.
   template <class Op, bool Prefetch, class Step>
-  CORVANE_FLAT static void run_task(const vec* in1, const vec* in2, vec* out, size_t offset, unsigned count, Step step) {
-    in1 += offset * Op::input_step();
-    if (in2 != nullptr) in2 += offset * Op::input_step();
-    out += offset * Op::output_step();
+  CORVANE_FLAT static void run_task(const vec* in1, const vec* in2, size_t first, unsigned count, Step step) {
     if (Prefetch) {
       const unsigned lines = count * Op::input_step();
-      hvx::fetch_linear<vec, 64>(in1, static_cast<uint8_t>(lines));
-      if (in2 != nullptr) hvx::fetch_linear<vec, 64>(in2, static_cast<uint8_t>(lines));
+      hvx::fetch_linear<vec, 64>(in1 + first * Op::input_step(), static_cast<uint8_t>(lines));
+      if (in2 != nullptr) hvx::fetch_linear<vec, 64>(in2 + first * Op::input_step(), static_cast<uint8_t>(lines));
     }
-    for (unsigned i = 0; i < count; ++i) {
-      step(in1, in2, out);
-      in1 += Op::input_step();
-      if (in2 != nullptr) in2 += Op::input_step();
-      out += Op::output_step();
-    }
+    for (size_t k = first; k != first + count; ++k) step(k);
   }
 };
 
@@ -90,8 +82,10 @@ template <class Op, bool Prefetch> class BinLoopExecutor : public TaskLoop<BinLo
     this->size = N;
   }
   void task(size_t offset, unsigned count) {
-    ExecutorBase::run_task<Op, Prefetch>(input1_start, input2_start, output_start, offset, count,
-                                          [](const vec* a, const vec* b, vec* o) { Op::doit(a, b, o); });
+    ExecutorBase::run_task<Op, Prefetch>(input1_start, input2_start, offset, count, [this](size_t k) {
+      Op::doit(input1_start + k * Op::input_step(), input2_start + k * Op::input_step(),
+               output_start + k * Op::output_step());
+    });
   }
 
   const vec* input1_start = nullptr;
@@ -112,8 +106,9 @@ class ScalarLoopExecutor : public TaskLoop<ScalarLoopExecutor<Op, Scalar, Prefet
   }
   void task(size_t offset, unsigned count) {
     const auto operand = Op::operand(scalar);  // formed once per task
-    ExecutorBase::run_task<Op, Prefetch>(input_start, nullptr, output_start, offset, count,
-                                          [operand](const vec* a, const vec*, vec* o) { Op::doit(a, operand, o); });
+    ExecutorBase::run_task<Op, Prefetch>(input_start, nullptr, offset, count, [this, operand](size_t k) {
+      Op::doit(input_start + k * Op::input_step(), operand, output_start + k * Op::output_step());
+    });
   }
 
   const vec* input_start = nullptr;
