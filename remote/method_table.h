@@ -95,11 +95,11 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
       in(u8, "dstDepth")))                                                                                        \
   M(7, hvx_sum, built, (in(seq_u8, "src"), rout(seq_i32, "dst"), in(i32, "data_size"), in(i32, "depth"),          \
       in(i32, "cn")))                                                                                             \
-  M(8, deinterleave2C, built,  (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),            \
+  M(8, deinterleave2C, built, (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),            \
       rout(ombuf, "output0"), rout(ombuf, "output1")))                                                            \
-  M(9, deinterleave3C, built,  (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),            \
+  M(9, deinterleave3C, built, (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),            \
       rout(ombuf, "output0"), rout(ombuf, "output1"), rout(ombuf, "output2")))                                    \
-  M(10, deinterleave4C, built,  (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),           \
+  M(10, deinterleave4C, built, (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "outputs_desc"),           \
       rout(ombuf, "output0"), rout(ombuf, "output1"), rout(ombuf, "output2"), rout(ombuf, "output3")))            \
   M(11, convertScaleAbs, built, (in(mbufd, "desc_in"), in(mbufd, "desc_out"), in(imbuf, "src"),                   \
       rout(ombuf, "dst"), in(f64, "alpha"), in(f64, "beta")))                                                     \
@@ -111,13 +111,13 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
   M(16, init, built, (in(u32, "mode")))                                                                           \
   M(17, deinit, built, ())                                                                                        \
   M(18, setmode, built, (in(u32, "mode")))                                                                        \
-  M(19, sobel8u, later, (in(seq_u8, "inp"), in(i32, "stride_i"), in(i32, "width"), in(i32, "height"),             \
+  M(19, sobel8u, built, (in(seq_u8, "inp"), in(i32, "stride_i"), in(i32, "width"), in(i32, "height"),             \
       inrout(seq_u8, "outp"), in(u32, "sobelmode")))                                                              \
-  M(20, sobel16s, later, (in(seq_u8, "inp"), in(i32, "stride_i"), in(i32, "width"), in(i32, "height"),            \
+  M(20, sobel16s, built, (in(seq_u8, "inp"), in(i32, "stride_i"), in(i32, "width"), in(i32, "height"),            \
       inrout(seq_i16, "outp"), in(u32, "sobelmode"), in(u32, "bordermode")))                                      \
-  M(21, sobel32f, later, (in(seq_u8, "inp"), in(i32, "stride_i"), in(i32, "width"), in(i32, "height"),            \
+  M(21, sobel32f, built, (in(seq_u8, "inp"), in(i32, "stride_i"), in(i32, "width"), in(i32, "height"),            \
       inrout(seq_i32, "outp"), in(u32, "sobelmode"), in(u32, "bordermode")))                                      \
-  M(22, conv3x3a328u, later, (in(seq_u8, "inp"), in(i32, "stride_i"), in(i32, "width"), in(i32, "height"),        \
+  M(22, conv3x3a328u, built, (in(seq_u8, "inp"), in(i32, "stride_i"), in(i32, "width"), in(i32, "height"),        \
       in(seq_u8, "mask"), in(i32, "shift"), inrout(seq_u8, "outp"), in(i32, "stride_o")))                         \
   M(23, cornerMinEigenVal, later, (in(seq_u8, "inp"), in(i32, "stride_i"), in(i32, "width"), in(i32, "height"),   \
       in(i32, "borderType"), in(i32, "blockSize"), inrout(seq_i32, "outpX2"), inrout(seq_i32, "outpXY"),          \
@@ -125,7 +125,7 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
       inrout(i32, "dspUsec")))                                                                                    \
   M(24, houghlines, later, (in(seq_u8, "inp"), in(u32, "width"), in(u32, "height"), in(u32, "stride"),            \
       in(f32, "threshold"), in(u32, "maxLines"), inrout(u32, "numLines"), inrout(seq_line, "pLines")))            \
-  M(25, median3x3, later, (in(seq_u8, "inp"), in(u32, "width"), in(u32, "height"), in(u32, "stride"),             \
+  M(25, median3x3, built, (in(seq_u8, "inp"), in(u32, "width"), in(u32, "height"), in(u32, "stride"),             \
       inrout(seq_u8, "outp"), in(u32, "borderType"), in(u32, "borderValue")))                                     \
   M(26, warp_perspective, later, (in(mbufd, "src_desc"), in(imbuf, "src_buf"), in(mbufd, "dst_desc"),             \
       rout(ombuf, "dst_buf"), in(mbufd, "delta_desc"), in(imbuf, "delta_buf"), in(i32, "interpolation"),          \
@@ -170,7 +170,7 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
   M(40, boxfilter, built, (in(mbufd, "input_desc"), in(imbuf, "input"), in(i32, "ddepth"),                        \
       in(i32, "kernel_width"), in(i32, "kernel_height"), in(u8, "normalize"), in(mbufd, "temp_desc"),             \
       in(imbuf, "temp"), in(mbufd, "output_desc"), rout(ombuf, "output")))                                        \
-  M(41, median_blur_3x3, later, (in(mbufd, "desc"), in(imbuf, "src"), rout(ombuf, "dst")))                        \
+  M(41, median_blur_3x3, built, (in(mbufd, "desc"), in(imbuf, "src"), rout(ombuf, "dst")))                        \
   M(42, pyrDown, later, (in(mbufd, "src_desc"), in(imbuf, "src"), in(mbufd, "dst_desc"), rout(ombuf, "dst")))     \
   M(43, pyrUp, later, (in(mbufd, "src_desc"), in(imbuf, "src"), in(mbufd, "buf_desc"), rout(ombuf, "buf"),        \
       in(mbufd, "dst_desc"), rout(ombuf, "dst")))                                                                 \
@@ -183,9 +183,9 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
       in(i32, "threshold"), in(i32, "max"), in(u32, "op")))                                                       \
   M(48, integrate, later, (in(seq_u8, "inp"), in(i32, "srcStride"), in(i32, "srcWidth"), in(i32, "srcHeight"),    \
       rout(seq_u32, "outp"), in(i32, "dstStride")))                                                               \
-  M(49, filter2D, later, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "dstDesc"), rout(ombuf, "dst"),       \
+  M(49, filter2D, built, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "dstDesc"), rout(ombuf, "dst"),       \
       in(seq_i16, "kernel"), in(i32, "delta")))                                                                   \
-  M(50, sobel, later, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "dstDesc"), rout(ombuf, "dst"),          \
+  M(50, sobel, built, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "dstDesc"), rout(ombuf, "dst"),          \
       in(i32, "ddepth"), in(i32, "dx"), in(i32, "dy"), in(i32, "ksize"), in(i32, "borderType")))                  \
   M(51, trackLK, later, (in(seq_u8, "prevImg"), in(seq_u8, "nextImg"), in(u32, "width"), in(u32, "height"),       \
       inrout(seq_f32, "featureXY"), inrout(seq_f32, "featureXY_out"), inrout(seq_f32, "featureXY_estimate"),      \

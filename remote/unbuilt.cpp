@@ -10,20 +10,10 @@ constexpr AEEResult kNotBuilt = hvx::RESULT_NOT_IMPLEMENTED;
 
 extern "C" {
 
-AEEResult corvane_sobel8u(const uint8_t*, int, int32_t, int32_t, int32_t, uint8_t*, int,
-    uint32_t) { return kNotBuilt; }
-AEEResult corvane_sobel16s(const uint8_t*, int, int32_t, int32_t, int32_t, int16_t*, int, uint32_t,
-    uint32_t) { return kNotBuilt; }
-AEEResult corvane_sobel32f(const uint8_t*, int, int32_t, int32_t, int32_t, int32_t*, int, uint32_t,
-    uint32_t) { return kNotBuilt; }
-AEEResult corvane_conv3x3a328u(const uint8_t*, int, int32_t, int32_t, int32_t, const uint8_t*, int, int32_t,
-    uint8_t*, int, int32_t) { return kNotBuilt; }
 AEEResult corvane_cornerMinEigenVal(const uint8_t*, int, int32_t, int32_t, int32_t, int32_t, int32_t, int32_t*, int,
     int32_t*, int, int32_t*, int, int32_t*, int, int32_t*, int, int32_t*, int, int32_t*) { return kNotBuilt; }
 AEEResult corvane_houghlines(const uint8_t*, int, uint32_t, uint32_t, uint32_t, float, uint32_t, uint32_t*, fcvLine*,
     int) { return kNotBuilt; }
-AEEResult corvane_median3x3(const uint8_t*, int, uint32_t, uint32_t, uint32_t, uint8_t*, int, uint32_t,
-    uint32_t) { return kNotBuilt; }
 AEEResult corvane_warp_perspective(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
     const corvane_mbufd*, const corvane_mbuf*, int32_t, int32_t,
     const corvane_border_value_info*) { return kNotBuilt; }
@@ -57,7 +47,6 @@ AEEResult corvane_morphOp(const corvane_mbufd*, const corvane_mbuf*, const corva
     int32_t, int32_t, int32_t, int32_t, uint32_t) { return kNotBuilt; }
 AEEResult corvane_morphologyEx(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
     const corvane_mbufd*, corvane_mbuf*, int32_t, int32_t, int32_t, int32_t, int32_t, uint32_t) { return kNotBuilt; }
-AEEResult corvane_median_blur_3x3(const corvane_mbufd*, const corvane_mbuf*, corvane_mbuf*) { return kNotBuilt; }
 AEEResult corvane_pyrDown(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*,
     corvane_mbuf*) { return kNotBuilt; }
 AEEResult corvane_pyrUp(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
@@ -69,10 +58,6 @@ AEEResult corvane_calcHist(const corvane_mbufd*, const corvane_mbuf*, const corv
     const uint8_t*, int, const uint8_t*, int) { return kNotBuilt; }
 AEEResult corvane_integrate(const uint8_t*, int, int32_t, int32_t, int32_t, uint32_t*, int,
     int32_t) { return kNotBuilt; }
-AEEResult corvane_filter2D(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
-    const int16_t*, int, int32_t) { return kNotBuilt; }
-AEEResult corvane_sobel(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, int32_t,
-    int32_t, int32_t, int32_t, int32_t) { return kNotBuilt; }
 AEEResult corvane_trackLK(const uint8_t*, int, const uint8_t*, int, uint32_t, uint32_t, float*, int, float*, int,
     float*, int, int32_t*, int, int32_t, uint32_t, uint32_t, int32_t, int32_t, float, int32_t,
     int32_t) { return kNotBuilt; }
