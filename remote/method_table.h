@@ -150,7 +150,7 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
       in(mbufd, "out_desc"), rout(ombuf, "corner_response"), in(i32, "blockSize"), in(i32, "borderType")))        \
   M(34, cornerHarris, later, (in(mbufd, "in_desc"), in(imbuf, "Dx"), in(imbuf, "Dy"), in(mbufd, "out_desc"),      \
       rout(ombuf, "corner_response"), in(i32, "blockSize"), in(f32, "k"), in(i32, "borderType")))                 \
-  M(35, gaussianBlur, later, (in(mbufd, "desc_in"), in(mbufd, "desc_out"), in(imbuf, "src"),                      \
+  M(35, gaussianBlur, built, (in(mbufd, "desc_in"), in(mbufd, "desc_out"), in(imbuf, "src"),                      \
       rout(ombuf, "dst"), in(i32, "kernel_size")))                                                                \
   M(36, goodFeaturesToTrack, later, (in(mbufd, "_imageDesc"), in(imbuf, "_image"), in(mbufd, "_maskDesc"),        \
       in(imbuf, "_mask"), in(f32, "qualityLevel"), in(f32, "minDistance"), in(i32, "blockSize"),                  \
@@ -161,10 +161,10 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
       rout(i32, "numberOfCorners")))                                                                              \
   M(37, LSC, later, (in(seq_u8, "src"), rout(seq_u8, "dst"), in(u32, "width"), in(u32, "height"),                 \
       in(seq_u8, "gain024"), in(seq_u8, "gain135")))                                                              \
-  M(38, morphOp, later, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "dstDesc"), rout(ombuf, "dst"),        \
+  M(38, morphOp, built, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "dstDesc"), rout(ombuf, "dst"),        \
       in(i32, "kernel"), in(i32, "iterations"), in(i32, "kernelShape"), in(i32, "borderType"),                    \
       in(i32, "borderValue"), in(u32, "op")))                                                                     \
-  M(39, morphologyEx, later, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "tmpDesc"), rout(ombuf, "tmp"),   \
+  M(39, morphologyEx, built, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "tmpDesc"), rout(ombuf, "tmp"),   \
       in(mbufd, "dstDesc"), rout(ombuf, "dst"), in(i32, "kernel"), in(i32, "iterations"),                         \
       in(i32, "kernelShape"), in(i32, "borderType"), in(i32, "borderValue"), in(u32, "op")))                      \
   M(40, boxfilter, built, (in(mbufd, "input_desc"), in(imbuf, "input"), in(i32, "ddepth"),                        \

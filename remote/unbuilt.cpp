@@ -35,18 +35,12 @@ AEEResult corvane_cornerMinEigenValFP(const corvane_mbufd*, const corvane_mbuf*,
     const corvane_mbufd*, corvane_mbuf*, int32_t, int32_t) { return kNotBuilt; }
 AEEResult corvane_cornerHarris(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbuf*, const corvane_mbufd*,
     corvane_mbuf*, int32_t, float, int32_t) { return kNotBuilt; }
-AEEResult corvane_gaussianBlur(const corvane_mbufd*, const corvane_mbufd*, const corvane_mbuf*, corvane_mbuf*,
-    int32_t) { return kNotBuilt; }
 AEEResult corvane_goodFeaturesToTrack(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*,
     const corvane_mbuf*, float, float, int32_t, uint8_t, float, int32_t, const corvane_mbufd*, corvane_mbuf*,
     corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
     const corvane_mbufd*, corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, int32_t*) { return kNotBuilt; }
 AEEResult corvane_LSC(const uint8_t*, int, uint8_t*, int, uint32_t, uint32_t, const uint8_t*, int, const uint8_t*,
     int) { return kNotBuilt; }
-AEEResult corvane_morphOp(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, int32_t,
-    int32_t, int32_t, int32_t, int32_t, uint32_t) { return kNotBuilt; }
-AEEResult corvane_morphologyEx(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
-    const corvane_mbufd*, corvane_mbuf*, int32_t, int32_t, int32_t, int32_t, int32_t, uint32_t) { return kNotBuilt; }
 AEEResult corvane_pyrDown(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*,
     corvane_mbuf*) { return kNotBuilt; }
 AEEResult corvane_pyrUp(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
