@@ -74,12 +74,13 @@ template <class T, bool Dilate, bool Cross> void epilogue(const in<vec>& src, co
   if (x == 1) morph_row<T, Dilate, Cross, true>(src, dst, bv, src.rows() - 1, dst.rows() - 1);
   else morph_row<T, Dilate, Cross, false>(src, dst, bv, src.rows() - 1, dst.rows() - 1);
 }
-// Rows 1 to rows - 2: worker 0 the even count E = (rows - 2) & ~1 from row 1, worker 1
-// the one row that may remain; x is the worker.
+// Rows 1 to rows - 2: worker 0 an even count E, about half, from row 1, worker 1 the
+// rest; x is the worker. Each row depends on the input alone, so the split decides
+// only who makes a row.
 template <class T, bool Dilate, bool Cross, bool Replicate>
 void body(const in<vec>& src, const out<vec>& dst, int bv, int x) {
-  const int inner = src.rows() - 2, even = inner & ~1;
-  const int first = x == 0 ? 1 : 1 + even, last = x == 0 ? even : inner;  // last: one past, from row 1
+  const int inner = src.rows() - 2, even = (inner / 2 + 1) & ~1;
+  const int first = x == 0 ? 1 : 1 + even, last = x == 0 ? even : inner;  // inclusive
   for (int y = first; y <= last; ++y) morph_row<T, Dilate, Cross, Replicate>(src, dst, bv, y, y);
 }
 

@@ -1,4 +1,4 @@
-// The pixel-wise kernels on two photographs (scripts/fetch-photos.sh puts them in
+// The pixel-wise kernels and the filters on two photographs (scripts/fetch-photos.sh puts them in
 // build/photos), in every mode, against the reference models: natural images have the
 // long flat runs and sharp edges that random data lacks.
 #include <gtest/gtest.h>
@@ -9,9 +9,13 @@
 #include <vector>
 
 #include "reference/arithm.h"
-#include "remote/corvane.h"
+#include "reference/gaussian.h"
+#include "reference/median.h"
+#include "reference/morph.h"
+#include "reference/sobel.h"
 #include "reference/sum.h"
 #include "reference/thresh.h"
+#include "remote/corvane.h"
 #include "support/platform.h"
 #include "tools/png_io.h"
 
@@ -114,6 +118,45 @@ TEST(Photo, ChannelSums) {
       for (int j = 0; j < 16; ++j) got[size_t(reference::lane_channel(0, cn, j))] += uint32_t(lanes[j]);
       EXPECT_EQ(reference::channel_totals(img->data(), size, 0, cn), got) << cn << " channels, " << units << " units";
     }
+}
+
+// The filters on the grey camera (512 x 512: whole vectors in every mode).
+TEST(Photo, Filters) {
+  const Image cam = photo("camera.png");
+  NEED_PHOTO(cam);
+  test::ScopedUnits scoped(4);
+  const corvane_mbufd& d = cam.descriptor();
+  const int n = cam.cols() * cam.rows();
+  for (int border : {0, 1, 4}) {
+    Image got(cam.cols(), cam.rows(), 1, corvane::client::I16);
+    std::vector<int16_t> want(static_cast<size_t>(n));
+    ASSERT_EQ(0, corvane_sobel16s(cam.data(), n, d.stride, d.cols, d.rows, reinterpret_cast<int16_t*>(got.data()), n,
+                                  0, uint32_t(border)));
+    reference::sobel_bordered(cam.data(), d.stride, d.cols, d.rows, 0, border, want);
+    EXPECT_EQ(0, std::memcmp(want.data(), got.data(), 2 * want.size())) << "sobel16s dx, border " << border;
+  }
+  for (int k : {3, 5, 7}) {
+    Image out(cam.cols(), cam.rows());
+    out.fill(0);
+    ASSERT_EQ(0, corvane_gaussianBlur(&d, &out.descriptor(), &cam.mbuf(), &out.mbuf(), k));
+    EXPECT_EQ(reference::gaussian_blur(d, cam.data(), out.descriptor(), std::vector<uint8_t>(out.byte_size(), 0), k),
+              bytes_of(out))
+        << "gaussian " << k;
+  }
+  Image out(cam.cols(), cam.rows());
+  out.fill(0);
+  ASSERT_EQ(0, corvane_median_blur_3x3(&d, &cam.mbuf(), &out.mbuf()));
+  EXPECT_EQ(reference::median_blur_3x3(d, cam.data(), cam.byte_size(), std::vector<uint8_t>(out.byte_size(), 0)),
+            bytes_of(out));
+  for (int kind = 0; kind < 4; ++kind) {
+    out.fill(0);
+    ASSERT_EQ(0, corvane_morphOp(&d, &cam.mbuf(), &out.descriptor(), &out.mbuf(), 3, 1, kind & 2, kind % 2 ? 0 : 1,
+                                 200, uint32_t(kind & 1)));
+    EXPECT_EQ(reference::morph(d, cam.data(), out.descriptor(), std::vector<uint8_t>(out.byte_size(), 0), kind,
+                               kind % 2 ? 0 : 1, 200),
+              bytes_of(out))
+        << "morphology " << kind;
+  }
 }
 
 }  // namespace
