@@ -2,8 +2,14 @@
 // below, against cv::blur (normalised u8) or cv::boxFilter (other output types). OpenCV
 // extends the image by reflection where ours counts zeros; the work per pixel is the same.
 // Only the vector modes are timed: the Scalar variant writes nothing.
+//
+// Then the 3x3 filters on a u8 frame beside OpenCV's operation of the same size and output
+// type: the Sobel jobs, the Gaussians, both medians, erosion, dilation and the opening
+// (with the edge replicated on both sides) and the 3x3 convolution.
+#include <functional>
 #include <memory>
 #include <string>
+#include <utility>
 
 #include <opencv2/imgproc.hpp>
 
@@ -72,6 +78,106 @@ bench_case boxfilter_case(const boxfilter_member& m) {
 CORVANE_BENCH_CASES(boxfilter_cases) {
   case_list cases;
   for (const boxfilter_member& m : kBoxfilterMembers) cases.push_back(boxfilter_case(m));
+  return cases;
+}
+
+// A random u8 frame, `stride` bytes a row (0: the row's own), and outputs of one type
+// whose stride is as many elements: ours, a second one (morphologyEx's first pass) and
+// OpenCV's, of its own type.
+struct filter_images {
+  Image src, dst, tmp, cv_dst;
+  filter_images(int32_t out_depth, int stride, int32_t cv_depth)
+      : src(kFrameCols, kFrameRows, 1, client::U8, stride),
+        dst(kFrameCols, kFrameRows, 1, out_depth, src.stride() * client::element_size(out_depth)),
+        tmp(dst),
+        cv_dst(kFrameCols, kFrameRows, 1, cv_depth) {
+    src.fill_random(17);
+  }
+};
+
+struct filter_shape {
+  int32_t out_depth = client::U8;
+  int stride = 0;  // of the input; 0: 1920
+  int32_t cv_depth = client::U8;
+};
+
+// A filter whose reference may be missing from this OpenCV build.
+bench_case filter_case(std::string name, int number, int64_t bytes, std::string ref_name, filter_shape shape,
+                       std::function<AEEResult(filter_images&)> ours,
+                       std::function<void(const cv::Mat& src, cv::Mat& dst)> reference) {
+  return {std::move(name), number, tools::ALL, kFramePixels, bytes, std::move(ref_name), [=] {
+            auto img = std::make_shared<filter_images>(shape.out_depth, shape.stride, shape.cv_depth);
+            std::function<void()> ref = [img, reference, src = as_mat(img->src), dst = as_mat(img->cv_dst)]() mutable {
+              reference(src, dst);
+            };
+            try {
+              ref();
+            } catch (const cv::Exception&) {
+              ref = nullptr;
+            }
+            return calls{[img, ours] { return ours(*img); }, ref};
+          }};
+}
+
+cv::Mat structuring(int shape) { return cv::getStructuringElement(shape, cv::Size(3, 3)); }
+
+CORVANE_BENCH_CASES(filter3x3_cases) {
+  const int64_t frame = kFramePixels;
+  case_list cases = {
+      filter_case("sobel8u/1920x1080_dx", method::sobel8u, 2 * frame, "cv::Sobel CV_8U", {},
+                  [](filter_images& i) { return client::sobel8u(i.src, i.dst, 0); },
+                  [](const cv::Mat& s, cv::Mat& d) { cv::Sobel(s, d, CV_8U, 1, 0, 3); }),
+      filter_case("sobel16s/1920x1080_dx", method::sobel16s, 3 * frame, "cv::Sobel CV_16S",
+                  {client::I16, 0, client::I16},
+                  [](filter_images& i) { return client::sobel16s(i.src, i.dst, 0, 1); },
+                  [](const cv::Mat& s, cv::Mat& d) { cv::Sobel(s, d, CV_16S, 1, 0, 3); }),
+      // OpenCV has no 32-bit integer Sobel; its float output is as wide.
+      filter_case("sobel32f/1920x1080_dx", method::sobel32f, 5 * frame, "cv::Sobel CV_32F",
+                  {client::I32, 0, client::F32},
+                  [](filter_images& i) { return client::sobel32f(i.src, i.dst, 0, 1); },
+                  [](const cv::Mat& s, cv::Mat& d) { cv::Sobel(s, d, CV_32F, 1, 0, 3); }),
+      // The SingleHVX median reads the vector after a row's last one: a wider stride holds it.
+      filter_case("median_blur_3x3/1920x1080", method::median_blur_3x3, 2 * frame, "cv::medianBlur", {client::U8, 2048},
+                  [](filter_images& i) { return client::median_blur_3x3(i.src, i.dst); },
+                  [](const cv::Mat& s, cv::Mat& d) { cv::medianBlur(s, d, 3); }),
+      filter_case("median3x3/1920x1080", method::median3x3, 2 * frame, "cv::medianBlur", {},
+                  [](filter_images& i) { return client::median3x3(i.src, i.dst.data(), int(i.dst.byte_size()), 0, 0); },
+                  [](const cv::Mat& s, cv::Mat& d) { cv::medianBlur(s, d, 3); }),
+      filter_case("morphologyEx/1920x1080_open_rect", method::morphologyEx, 4 * frame, "cv::morphologyEx MORPH_OPEN",
+                  {},
+                  [](filter_images& i) { return client::morphologyEx(i.src, i.tmp, i.dst, 2, 0, 1, 0); },
+                  [](const cv::Mat& s, cv::Mat& d) {
+                    cv::morphologyEx(s, d, cv::MORPH_OPEN, structuring(cv::MORPH_RECT), cv::Point(-1, -1), 1,
+                                     cv::BORDER_REPLICATE);
+                  }),
+      filter_case("conv3x3a328u/1920x1080", method::conv3x3a328u, 2 * frame, "cv::filter2D CV_8U", {},
+                  [](filter_images& i) {
+                    static constexpr int8_t kSharpen[12] = {0, -1, 0, 0, -1, 5, -1, 0, 0, -1, 0, 0};
+                    return client::conv3x3a328u(i.src, kSharpen, 0, i.dst);
+                  },
+                  [](const cv::Mat& s, cv::Mat& d) {
+                    const cv::Mat sharpen = (cv::Mat_<float>(3, 3) << 0, -1, 0, -1, 5, -1, 0, -1, 0);
+                    cv::filter2D(s, d, CV_8U, sharpen);
+                  }),
+  };
+  for (int k : {3, 5, 7})
+    cases.push_back(filter_case("gaussianBlur/1920x1080_" + std::to_string(k) + "x" + std::to_string(k),
+                                method::gaussianBlur, 2 * frame, "cv::GaussianBlur", {},
+                                [k](filter_images& i) { return client::gaussianBlur(i.src, i.dst, k); },
+                                [k](const cv::Mat& s, cv::Mat& d) { cv::GaussianBlur(s, d, cv::Size(k, k), 0); }));
+  for (uint32_t op : {0u, 1u})
+    for (int shape : {0, 2}) {
+      const bool rect = shape == 0;
+      cases.push_back(filter_case(
+          std::string("morphOp/1920x1080_") + (op ? "dilate" : "erode") + (rect ? "_rect" : "_cross"), method::morphOp,
+          2 * frame, op ? "cv::dilate" : "cv::erode", {},
+          [op, shape](filter_images& i) { return client::morphOp(i.src, i.dst, op, shape, 1, 0); },
+          [op, rect](const cv::Mat& s, cv::Mat& d) {
+            const cv::Mat k = structuring(rect ? cv::MORPH_RECT : cv::MORPH_CROSS);
+            if (op) cv::dilate(s, d, k, cv::Point(-1, -1), 1, cv::BORDER_REPLICATE);
+            else cv::erode(s, d, k, cv::Point(-1, -1), 1, cv::BORDER_REPLICATE);
+          }));
+    }
   return cases;
 }
 

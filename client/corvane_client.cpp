@@ -64,6 +64,66 @@ AEEResult thresh(const Image& src, Image& dst, int32_t threshold, int32_t max, u
   return call<method::thresh>(&src.descriptor(), &src.mbuf(), &dst.descriptor(), &dst.mbuf(), threshold, max, op);
 }
 
+AEEResult sobel8u(const Image& in, Image& out, uint32_t sobelmode) {
+  return call<method::sobel8u>(in.data(), int(in.byte_size()), in.stride(), in.cols(), in.rows(), out.data(),
+                               int(out.byte_size()), sobelmode);
+}
+
+AEEResult sobel16s(const Image& in, Image& out, uint32_t sobelmode, uint32_t bordermode) {
+  return call<method::sobel16s>(in.data(), int(in.byte_size()), in.stride(), in.cols(), in.rows(),
+                                reinterpret_cast<int16_t*>(out.data()), int(out.byte_size() / 2), sobelmode,
+                                bordermode);
+}
+
+AEEResult sobel32f(const Image& in, Image& out, uint32_t sobelmode, uint32_t bordermode) {
+  return call<method::sobel32f>(in.data(), int(in.byte_size()), in.stride(), in.cols(), in.rows(),
+                                reinterpret_cast<int32_t*>(out.data()), int(out.byte_size() / 4), sobelmode,
+                                bordermode);
+}
+
+AEEResult sobel(const Image& in, Image& out, int32_t ddepth, int32_t dx, int32_t dy, int32_t ksize,
+                int32_t border_type) {
+  return call<method::sobel>(&in.descriptor(), &in.mbuf(), &out.descriptor(), &out.mbuf(), ddepth, dx, dy, ksize,
+                             border_type);
+}
+
+AEEResult conv3x3a328u(const Image& in, const int8_t (&mask)[12], int32_t shift, Image& out) {
+  return call<method::conv3x3a328u>(in.data(), int(in.byte_size()), in.stride(), in.cols(), in.rows(),
+                                    reinterpret_cast<const uint8_t*>(mask), 12, shift, out.data(),
+                                    int(out.byte_size()), out.stride());
+}
+
+AEEResult gaussianBlur(const Image& in, Image& out, int32_t kernel_size) {
+  return call<method::gaussianBlur>(&in.descriptor(), &out.descriptor(), &in.mbuf(), &out.mbuf(), kernel_size);
+}
+
+AEEResult median_blur_3x3(const Image& in, Image& out) {
+  return call<method::median_blur_3x3>(&in.descriptor(), &in.mbuf(), &out.mbuf());
+}
+
+AEEResult median3x3(const Image& in, uint8_t* out, int out_len, uint32_t border_type, uint32_t border_value) {
+  return call<method::median3x3>(in.data(), int(in.byte_size()), uint32_t(in.cols()), uint32_t(in.rows()),
+                                 uint32_t(in.stride()), out, out_len, border_type, border_value);
+}
+
+AEEResult morphOp(const Image& src, Image& dst, uint32_t op, int32_t kernel_shape, int32_t border_type,
+                  int32_t border_value) {
+  // The kernel size (always 3x3) and the iteration count (always one pass) are not read.
+  return call<method::morphOp>(&src.descriptor(), &src.mbuf(), &dst.descriptor(), &dst.mbuf(), 3, 1, kernel_shape,
+                               border_type, border_value, op);
+}
+
+AEEResult morphologyEx(const Image& src, Image& tmp, Image& dst, uint32_t op, int32_t kernel_shape,
+                       int32_t border_type, int32_t border_value) {
+  return call<method::morphologyEx>(&src.descriptor(), &src.mbuf(), &tmp.descriptor(), &tmp.mbuf(),
+                                    &dst.descriptor(), &dst.mbuf(), 3, 1, kernel_shape, border_type, border_value, op);
+}
+
+AEEResult filter2D(const Image& src, Image& dst, const int16_t* kernel, int kernel_len, int32_t delta) {
+  return call<method::filter2D>(&src.descriptor(), &src.mbuf(), &dst.descriptor(), &dst.mbuf(), kernel, kernel_len,
+                                delta);
+}
+
 AEEResult load() { return call<method::load>(); }
 AEEResult init(uint32_t power_level) { return call<method::init>(power_level); }
 AEEResult setmode(uint32_t power_level) { return call<method::setmode>(power_level); }

@@ -91,7 +91,7 @@ constexpr method_modes kMethodModes[] = {
     modes_row::k(modes_row::m::thresh, DHVX),
     modes_row::k(modes_row::m::integrate, DHVX),
     modes_row::answers(modes_row::m::filter2D, 0),
-    modes_row::k(modes_row::m::sobel, ALL),
+    modes_row::answers(modes_row::m::sobel, 0),  // no kernel behind the descriptor form
     modes_row::k(modes_row::m::trackLK, SCALAR),
     modes_row::k(modes_row::m::opticalFlow, SHVX),
 };

@@ -118,7 +118,31 @@ void parse_ksize(const std::string& text, options& o) {
       throw usage_error("--ksize " + text + ": each side is odd, 1 to 15 (an even size is served by the next odd one)");
 }
 
-// Every option: the methods that take it and how it sets the options.
+// "a,b,c,...": exactly `n` integers from lo to hi.
+std::vector<int> parse_list(const std::string& text, size_t n, int lo, int hi, const char* what) {
+  std::vector<int> values;
+  bool in_range = true;
+  for (size_t start = 0;;) {
+    const size_t comma = text.find(',', start);
+    values.push_back(parse_int(text.substr(start, comma == std::string::npos ? comma : comma - start), what));
+    in_range = in_range && values.back() >= lo && values.back() <= hi;
+    if (comma == std::string::npos) break;
+    start = comma + 1;
+  }
+  if (values.size() != n || !in_range)
+    throw usage_error(std::string(what) + " " + text + ": give " + std::to_string(n) + " numbers from " +
+                      std::to_string(lo) + " to " + std::to_string(hi) + ", separated by commas");
+  return values;
+}
+
+constexpr const char* kSobelBorders[] = {"constant", "replicate", "reflect101"};
+constexpr int kSobelBorderCodes[] = {0, 1, 4};
+constexpr const char* kMedianBorders[] = {"replicate", "constant"};  // borderType 0 and 1
+constexpr const char* kMorphBorders[] = {"constant", "replicate"};   // borderType 0 and 1
+constexpr const char* kShapes[] = {"rect", "cross"};                 // kernelShape 0 and 2
+
+// Every option: the methods that take it and how it sets the options. Options are applied
+// once the method is known, so that a name can mean a method's own values.
 struct option_row {
   const char* name;
   const char* methods;  // space-separated; nullptr: every method
@@ -134,7 +158,16 @@ const option_row kOptions[] = {
        if (!parse_mode(v, o.m)) throw usage_error("--mode " + v + ": give scalar, shvx or dhvx");
        o.mode_given = true;
      }},
-    {"--ksize", "boxfilter", true, [](options& o, const std::string& v) { parse_ksize(v, o); }},
+    {"--ksize", "boxfilter gaussian", true,
+     [](options& o, const std::string& v) {
+       if (o.method == "gaussian") {
+         o.kernel_width = o.kernel_height = parse_int(v, "--ksize");
+         if (o.kernel_width != 3 && o.kernel_width != 5 && o.kernel_width != 7)
+           throw usage_error("--ksize " + v + ": gaussian takes 3, 5 or 7");
+       } else {
+         parse_ksize(v, o);
+       }
+     }},
     {"--ddepth", "boxfilter", true, [](options& o, const std::string& v) { o.ddepth = v; }},
     {"--normalize", "boxfilter", false, [](options& o, const std::string&) { o.normalize = true; }},
     {"--no-normalize", "boxfilter", false, [](options& o, const std::string&) { o.normalize = false; }},
@@ -144,13 +177,42 @@ const option_row kOptions[] = {
        o.max = parse_int(v, "--max");
        o.max_given = true;
      }},
-    {"--op", "thresh", true, [](options& o, const std::string& v) { o.op = uint32_t(pick(kThreshOps, v, "--op")); }},
+    {"--op", "thresh morph", true,
+     [](options& o, const std::string& v) {
+       o.op = uint32_t(o.method == "morph" ? pick(kMorphOps, v, "--op") : pick(kThreshOps, v, "--op"));
+     }},
     {"--alpha", "convertScaleAbs", true, [](options& o, const std::string& v) { o.alpha = parse_double(v, "--alpha"); }},
     {"--beta", "convertScaleAbs", true, [](options& o, const std::string& v) { o.beta = parse_double(v, "--beta"); }},
     {"--scale", "vmul_scale vdiv_scale", true,
      [](options& o, const std::string& v) { o.scale = parse_int(v, "--scale"); }},
     {"--out", kArithm, true,
      [](options& o, const std::string& v) { o.out_depth = kOutDepths[pick(kOutNames, v, "--out")]; }},
+    {"--deriv", "sobel", true,
+     [](options& o, const std::string& v) { o.deriv = uint32_t(pick(kDerivs, v, "--deriv")); }},
+    {"--depth", "sobel", true,
+     [](options& o, const std::string& v) { o.out_bytes = 1 << pick(kSobelDepths, v, "--depth"); }},
+    {"--border", "sobel median3x3 morph", true,
+     [](options& o, const std::string& v) {
+       if (o.method == "sobel") o.border = kSobelBorderCodes[pick(kSobelBorders, v, "--border")];
+       else if (o.method == "median3x3") o.border = pick(kMedianBorders, v, "--border");
+       else o.border = pick(kMorphBorders, v, "--border");
+     }},
+    {"--value", "median3x3 morph", true,
+     [](options& o, const std::string& v) {
+       o.value = parse_int(v, "--value");
+       o.value_given = true;
+     }},
+    {"--shape", "morph", true, [](options& o, const std::string& v) { o.shape = 2 * pick(kShapes, v, "--shape"); }},
+    {"--mask", "conv3x3", true,
+     [](options& o, const std::string& v) {
+       const std::vector<int> m = parse_list(v, 9, -128, 127, "--mask");
+       for (int i = 0; i < 9; ++i) o.mask[i] = int8_t(m[size_t(i)]);
+     }},
+    {"--shift", "conv3x3", true,
+     [](options& o, const std::string& v) {
+       o.shift = parse_int(v, "--shift");
+       if (o.shift < 0 || o.shift > 15) throw usage_error("--shift " + v + ": give 0 to 15");
+     }},
 };
 
 job identity_job(const options& o) {
@@ -233,6 +295,12 @@ const cli_method kCliMethods[] = {
     {"vmul_scale", method::vmul_scale, "IN.png OUT.png", "--scale", arithm_job},
     {"vdiv_scale", method::vdiv_scale, "IN.png OUT.png", "--scale", arithm_job},
     {"hvx_sum", method::hvx_sum, "IN.png", nullptr, sum_job},
+    {"sobel", method::sobel8u, "IN.png OUT.png", nullptr, sobel_job},  // sobel16s and sobel32f: the same modes
+    {"gaussian", method::gaussianBlur, "IN.png OUT.png", nullptr, gaussian_job},
+    {"median", method::median_blur_3x3, "IN.png OUT.png", nullptr, median_job},
+    {"median3x3", method::median3x3, "IN.png OUT.png", nullptr, median3x3_job},
+    {"morph", method::morphOp, "IN.png OUT.png", "--op", morph_job},  // morphologyEx: the same modes
+    {"conv3x3", method::conv3x3a328u, "IN.png OUT.png", "--mask", conv3x3_job},
 };
 
 bool listed(const char* methods, const std::string& name) {
@@ -251,6 +319,7 @@ options parse(int argc, char** argv, const cli_method*& row) {
   options o;
   std::vector<std::string> positional;
   std::set<std::string> given;
+  std::vector<std::pair<const option_row*, std::string>> values;
   for (int i = 0; i < argc; ++i) {
     std::string arg = argv[i], value;
     const bool is_option = arg.size() > 2 && arg.compare(0, 2, "--") == 0;
@@ -273,7 +342,7 @@ options parse(int argc, char** argv, const cli_method*& row) {
       if (i + 1 >= argc) throw usage_error(arg + " wants a value");
       value = argv[++i];
     }
-    known->set(o, value);
+    values.emplace_back(known, value);
     given.insert(arg);
   }
   if (positional.empty()) throw usage_error("wants a method and its files");
@@ -291,6 +360,7 @@ options parse(int argc, char** argv, const cli_method*& row) {
   for (const option_row& s : kOptions)
     if (given.count(s.name) && !listed(s.methods, o.method))
       throw usage_error(std::string(s.name) + " is not an option of " + o.method + " (it is one of " + s.methods + ")");
+  for (const auto& v : values) v.first->set(o, v.second);
   if (row->required != nullptr && !given.count(row->required))
     throw usage_error(o.method + " wants " + row->required);
   return o;
@@ -344,6 +414,13 @@ void print_run_usage(FILE* out) {
       "       corvane run vadd_mm|vsub_mm|vmul_mm|vdiv_mm [--out T] [--mode M] A.png B.png OUT.png\n"
       "       corvane run vmul_scale|vdiv_scale --scale S [--out T] [--mode M] IN.png OUT.png\n"
       "       corvane run hvx_sum IN.png\n"
+      "       corvane run sobel [--deriv dx|dy|dxy] [--depth 8u|16s|32f] [--border B] IN.png OUT.png\n"
+      "       corvane run gaussian [--ksize 3|5|7] IN.png OUT.png\n"
+      "       corvane run median IN.png OUT.png\n"
+      "       corvane run median3x3 [--border replicate|constant] [--value V] IN.png OUT.png\n"
+      "       corvane run morph --op OP [--shape rect|cross] [--border constant|replicate] [--value V]\n"
+      "                         IN.png OUT.png\n"
+      "       corvane run conv3x3 --mask a,b,c,d,e,f,g,h,i [--shift N] IN.png OUT.png\n"
       "  IN.png     8-bit or 16-bit PNG, grey, grey+alpha, RGB or RGBA (channels are filtered apart)\n"
       "  --mode     scalar, shvx or dhvx (default: CORVANE_MODE, else the best the method allows)\n"
       "  --ksize    odd sides 1 to 15, default 3x3; 5 means 5x5\n"
@@ -360,7 +437,21 @@ void print_run_usage(FILE* out) {
       "             inputs agree in size and type. --out u8, u16, i16 or i32 (default: the input's); the\n"
       "             vector methods serve the combinations of their tables only (else they answer 4).\n"
       "             vdiv_scale computes S / element, a zero divisor gives 0\n"
-      "  hvx_sum:   prints each channel's total from the method's lanes and from the host\n");
+      "  hvx_sum:   prints each channel's total from the method's lanes and from the host\n"
+      "  The filters below take 8-bit grey PNG (morph also 16-bit, as u16) and write the image's size.\n"
+      "  sobel:     one 3x3 derivative, default dx; 8u clamps to 0..255 and leaves the first and last\n"
+      "             rows 0, with 0 outside the image; 16s and 32f write min(|d|, 255) as 8-bit PNG, with\n"
+      "             --border constant (0 outside), replicate or reflect101 (the default)\n"
+      "  gaussian:  3x3, 5x5 or 7x7 Gaussian, 0 outside the image; the first and last ksize/2 rows stay 0\n"
+      "  median:    3x3 median (median_blur_3x3, SingleHVX), 0 outside; the first and last rows stay 0\n"
+      "  median3x3: 3x3 median on the scalar core, every row; --border replicate (default) or constant\n"
+      "             (--value V, its low 8 bits)\n"
+      "  morph:     --op erode, dilate, open, close, gradient, tophat or blackhat over a 3x3 --shape\n"
+      "             rect (default) or cross; --border replicate (default) or constant (--value V, clamped\n"
+      "             to the sample's range); gradient, tophat and blackhat are subtracted on the host\n"
+      "  conv3x3:   clamp(int16(sum of weight x pixel >> N), 0, 255) over 3x3 (a correlation, weights\n"
+      "             -128 to 127, row after row, shift 0 to 15, default 0), 0 outside; the first and last\n"
+      "             rows and the first column stay 0\n");
 }
 
 int run_command(int argc, char** argv) {

@@ -46,6 +46,15 @@ struct options {
   // the element-wise arithmetic
   int scale = 0;
   int out_depth = -1;  // -1: the input's
+  // the neighbourhood filters
+  uint32_t deriv = 0;     // sobel: 0 dx, 1 dy, 2 dxy
+  int out_bytes = 1;      // sobel: 1 (8u), 2 (16s) or 4 (32f)
+  int border = -1;        // sobel, median3x3, morph: the method's border code; -1 its default
+  bool value_given = false;
+  int value = 0;          // median3x3, morph: the constant outside the image
+  int shape = 0;          // morph: 0 rectangle, 2 cross
+  int8_t mask[9] = {};    // conv3x3, row after row
+  int shift = 0;          // conv3x3
 };
 
 // One prepared call on images already read: `finish` runs after it answered 0, writes
@@ -60,6 +69,11 @@ struct job {
 
 // thresh's operations by number, as --op names them.
 inline constexpr const char* kThreshOps[] = {"binary", "binary_inv", "trunc", "tozero", "tozero_inv"};
+// sobel's derivatives by sobelmode, and its output types (8u, 16s, 32f by log2 of the size).
+inline constexpr const char* kDerivs[] = {"dx", "dy", "dxy"};
+inline constexpr const char* kSobelDepths[] = {"8u", "16s", "32f"};
+// The morphology operations by number (0 and 1 morphOp, 2 to 6 morphologyEx).
+inline constexpr const char* kMorphOps[] = {"erode", "dilate", "open", "close", "gradient", "tophat", "blackhat"};
 
 int parse_int(const std::string& text, const char* what);
 const char* type_name(int32_t depth);
@@ -72,6 +86,12 @@ job thresh_job(const options& o);
 job convert_job(const options& o);
 job arithm_job(const options& o);
 job sum_job(const options& o);
+job sobel_job(const options& o);
+job gaussian_job(const options& o);
+job median_job(const options& o);
+job median3x3_job(const options& o);
+job morph_job(const options& o);
+job conv3x3_job(const options& o);
 
 }  // namespace run_detail
 

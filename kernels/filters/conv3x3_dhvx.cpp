@@ -1,6 +1,9 @@
-// The 3x3 convolution job in DualHVX. Each output vector sums twelve exact products in
-// 32-bit lanes: a pixel times a signed byte fits 16 bits, and the products are widened
-// as they are added. A zero weight (the fourth column of a 3x3 mask) is skipped.
+// The 3x3 convolution job in DualHVX. Each weight is split as w = 16 h + l, with l in
+// 0..15 and h in -8..7, so that both partial sums of an output stay exact in 16-bit
+// lanes: the sum of the pixels times h lies within +-24480, that of the pixels times l
+// within 0..45900 (read as unsigned). S = 16 A + B is formed in 32 bits once per output
+// vector. A zero part of a weight is skipped: the fourth column of a 3x3 mask, and the
+// high parts of every weight of a non-negative mask below 16.
 #include "core/direct_job.h"
 #include "core/vector/ops.h"
 #include "kernels/filters/conv3x3.h"
@@ -15,20 +18,36 @@ constexpr int N = static_cast<int>(mode_vector_bytes<M>);
 typedef gen_vec<M> vec;
 typedef vu8_t<M> vu8;
 typedef vi16_t<M> vi16;
-typedef wvi16_t<M> wvi16;
 typedef vi32_t<M> vi32;
+typedef wvi16_t<M> wvi16;
 typedef wvi32_t<M> wvi32;
 
-// acc += w * pixels, for the 128 pixels of x in pixel order (acc[0] the first 64).
-inline void add_products(wvi32 (&acc)[2], vec x, int8_t w) {
-  const wvi16 p = vcast<wvi16>(vunpack(vu8(x)));
-  const vi16 zero = vzero<vi16>();
-  const vi8x4 weight(w, w, w, w);
-  acc[0] = vadd_w(acc[0], vunpack(vmpyiacc(zero, lo(p), weight)));
-  acc[1] = vadd_w(acc[1], vunpack(vmpyiacc(zero, hi(p), weight)));
+struct split_mask {
+  int8_t high[12], low[12];
+};
+inline split_mask split(const int8_t (&mask)[12]) {
+  split_mask m{};
+  for (int i = 0; i < 12; ++i) {
+    m.low[i] = static_cast<int8_t>(mask[i] & 15);
+    m.high[i] = static_cast<int8_t>((mask[i] - m.low[i]) / 16);
+  }
+  return m;
 }
 
-CORVANE_FLAT void conv_row(const job_args& a, int y) {
+// acc + x * w in each half of a pair of 16-bit lanes.
+inline wvi16 add_scaled(const wvi16& acc, const wvi16& x, int8_t w) {
+  const vi8x4 f(w, w, w, w);
+  return vcombine(vmpyiacc(hi(acc), hi(x), f), vmpyiacc(lo(acc), lo(x), f));
+}
+
+// 64 outputs from their partial sums: (16 A + B) >> shift cut to 16 bits.
+inline vi16 narrow(vi16 a, vi16 b, int shift) {
+  const wvi32 wa = vunpack(a), wb = vcast<wvi32>(vunpack(vu16_t<M>(b)));
+  const vi32 s0 = vadd(vasl(lo(wa), 4), lo(wb)), s1 = vadd(vasl(hi(wa), 4), hi(wb));
+  return vpacke(vasr(s1, shift), vasr(s0, shift));
+}
+
+CORVANE_FLAT void conv_row(const job_args& a, const split_mask& m, int y) {
   const int vectors = a.width / N;
   const size_t in_stride = static_cast<unsigned>(a.src_stride);
   const uint8_t* const in_rows[3] = {a.src + (y - 1) * in_stride, a.src + y * in_stride, a.src + (y + 1) * in_stride};
@@ -39,29 +58,36 @@ CORVANE_FLAT void conv_row(const job_args& a, int y) {
     cur[r] = reinterpret_cast<const vec*>(in_rows[r])[0];
   }
   const int shift = a.shift & 15;
+  const wvi16 zero = vcombine(vzero<vi16>(), vzero<vi16>());
   for (int j = 0; j < vectors; ++j) {
-    const vi32 zero = vzero<vi32>();
-    wvi32 acc[2] = {vcombine(zero, zero), vcombine(zero, zero)};
+    wvi16 sum_high = zero, sum_low = zero;
     for (int r = 0; r < 3; ++r) {
       const vec next = j + 1 < vectors ? reinterpret_cast<const vec*>(in_rows[r])[j + 1]
                                        : load_within<vec>(in_rows[r] + static_cast<size_t>(vectors) * N, a.src_end);
-      const vec taps[4] = {vlalign(cur[r], prev[r], 1), cur[r], valign(next, cur[r], 1), valign(next, cur[r], 2)};
-      for (int k = 0; k < 4; ++k)
-        if (a.mask[4 * r + k] != 0) add_products(acc, taps[k], a.mask[4 * r + k]);
+      auto tap = [&](vec x, int i) {
+        const int8_t low = m.low[i], high = m.high[i];
+        if (low == 0 && high == 0) return;
+        const wvi16 p = vcast<wvi16>(vunpack(vu8(x)));
+        if (low != 0) sum_low = add_scaled(sum_low, p, low);
+        if (high != 0) sum_high = add_scaled(sum_high, p, high);
+      };
+      tap(vlalign(cur[r], prev[r], 1), 4 * r);
+      tap(cur[r], 4 * r + 1);
+      tap(valign(next, cur[r], 1), 4 * r + 2);
+      tap(valign(next, cur[r], 2), 4 * r + 3);
       prev[r] = cur[r];
       cur[r] = next;
     }
-    // (S >> shift) cut to 16 bits, then clamped to 0..255.
-    const vi16 s0 = vpacke(vasr(hi(acc[0]), shift), vasr(lo(acc[0]), shift));
-    const vi16 s1 = vpacke(vasr(hi(acc[1]), shift), vasr(lo(acc[1]), shift));
-    out[j] = vpack_usat(s1, s0);
+    // Then clamped to 0..255.
+    out[j] = vpack_usat(narrow(hi(sum_high), hi(sum_low), shift), narrow(lo(sum_high), lo(sum_low), shift));
   }
 }
 
 struct conv_job : direct_job {
   job_args args;
+  split_mask mask;
   void run_rows(int first, int count) {
-    for (int y = first + 1; y < first + 1 + count; ++y) conv_row(args, y);
+    for (int y = first + 1; y < first + 1 + count; ++y) conv_row(args, mask, y);
   }
 };
 
@@ -70,6 +96,7 @@ struct conv_job : direct_job {
 template <int Isa> AEEResult run_job(const job_args& args) {
   conv_job job;
   job.args = args;
+  job.mask = split(args.mask);
   return run_direct_job(job, args.height - 2);
 }
 

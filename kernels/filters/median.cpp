@@ -7,50 +7,61 @@ namespace hvx {
 namespace median {
 namespace {
 
-constexpr int kChunk = 256;  // output columns per pass, so that the rows fit on the stack
+constexpr int kChunk = 1024;  // output columns per pass, so that the rows fit on the stack
+constexpr int kPadded = kChunk + 16;  // its columns and two neighbours, in whole 16-byte runs
 
 inline uint8_t min8(uint8_t a, uint8_t b) { return a < b ? a : b; }
 inline uint8_t max8(uint8_t a, uint8_t b) { return a < b ? b : a; }
 inline uint8_t med3(uint8_t a, uint8_t b, uint8_t c) { return max8(min8(a, b), min8(max8(a, b), c)); }
 
-// Pixel x of a row, or the border outside it.
-inline uint8_t at(const uint8_t* row, int64_t x, uint32_t width, bool replicate, uint8_t border) {
-  if (x >= 0 && x < width) return row[x];
-  if (!replicate) return border;
-  return row[x < 0 ? 0 : width - 1];
+// Columns x0 - 1 to x0 + n of a row (null: the border), with the border outside it.
+void fill_padded(uint8_t* pad, const uint8_t* row, uint32_t x0, int n, uint32_t width, bool replicate,
+                 uint8_t border) {
+  if (row == nullptr) {
+    __builtin_memset(pad, border, size_t(n) + 2);
+    return;
+  }
+  const bool first = x0 == 0, last = x0 + uint32_t(n) == width;  // the chunk touches an edge
+  const uint32_t from = first ? 0 : x0 - 1, to = last ? width : x0 + uint32_t(n) + 1;
+  __builtin_memcpy(pad + (first ? 1 : 0), row + from, to - from);
+  if (first) pad[0] = replicate ? row[0] : border;
+  if (last) pad[n + 1] = replicate ? row[width - 1] : border;
 }
 
 }  // namespace
 
-// Columns in chunks: the three rows of a chunk and its two neighbour columns are
+// Columns in chunks: the chunk's three rows, each with its two neighbour columns, are
 // sorted column by column, then each output takes the median of its window from them.
+// The two passes run over whole chunks, lengths the compiler knows in whole 16-byte
+// runs, so that they vectorise; the columns past the image are dropped.
 void median3x3(const uint8_t* src, uint32_t width, uint32_t height, uint32_t stride, uint8_t* dst, bool replicate,
                uint8_t border) {
-  uint8_t hi[kChunk + 2], mid[kChunk + 2], lo[kChunk + 2];
+  uint8_t pad[3][kPadded] = {}, hi[kPadded], mid[kPadded], lo[kPadded], res[kChunk];
   for (uint32_t y = 0; y < height; ++y) {
     const uint8_t* row[3];
     for (int k = 0; k < 3; ++k) {
       const int64_t r = int64_t(y) + k - 1;
-      row[k] = r < 0 || r >= height ? (replicate ? src + (r < 0 ? 0 : size_t(height - 1) * stride) : nullptr)
-                                    : src + size_t(r) * stride;
+      row[k] = r >= 0 && r < height ? src + size_t(r) * stride
+               : replicate          ? src + (r < 0 ? 0 : size_t(height - 1) * stride)
+                                    : nullptr;
     }
     uint8_t* const out = dst + size_t(y) * width;
     for (uint32_t x0 = 0; x0 < width; x0 += kChunk) {
       const int n = width - x0 < kChunk ? int(width - x0) : kChunk;
-      for (int i = 0; i < n + 2; ++i) {
-        const int64_t x = int64_t(x0) + i - 1;
-        uint8_t v[3];
-        for (int k = 0; k < 3; ++k) v[k] = row[k] ? at(row[k], x, width, replicate, border) : border;
-        const uint8_t t = min8(v[0], v[1]), u = max8(v[0], v[1]);
-        hi[i] = max8(u, v[2]);
-        lo[i] = min8(t, v[2]);
-        mid[i] = max8(t, min8(u, v[2]));
+      for (int k = 0; k < 3; ++k) fill_padded(pad[k], row[k], x0, n, width, replicate, border);
+      for (int i = 0; i < kPadded; ++i) {
+        const uint8_t a = pad[0][i], b = pad[1][i], c = pad[2][i];
+        const uint8_t t = min8(a, b), u = max8(a, b);
+        hi[i] = max8(u, c);
+        lo[i] = min8(t, c);
+        mid[i] = max8(t, min8(u, c));
       }
-      for (int i = 0; i < n; ++i) {
+      for (int i = 0; i < kChunk; ++i) {
         const uint8_t h = min8(min8(hi[i], hi[i + 1]), hi[i + 2]);
         const uint8_t l = max8(max8(lo[i], lo[i + 1]), lo[i + 2]);
-        out[x0 + i] = med3(h, l, med3(mid[i], mid[i + 1], mid[i + 2]));
+        res[i] = med3(h, l, med3(mid[i], mid[i + 1], mid[i + 2]));
       }
+      __builtin_memcpy(out + x0, res, size_t(n));
     }
   }
 }

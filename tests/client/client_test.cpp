@@ -127,7 +127,7 @@ TEST(ClientControl, BuiltControlMethodsThroughTheSkeleton) {
 
 TEST(ClientCall, UnbuiltMethodAnswers20) {
   Image src(16, 4), dst(16, 4);
-  EXPECT_EQ(call<method::median_blur_3x3>(&src.descriptor(), &src.mbuf(), &dst.mbuf()), 20);
+  EXPECT_EQ(call<method::pyrDown>(&src.descriptor(), &src.mbuf(), &dst.descriptor(), &dst.mbuf()), 20);
 }
 
 }  // namespace

@@ -21,7 +21,7 @@ struct hash_case {
   int method;
   const char* label;
   int nargs;
-  arg args[10];
+  arg args[12];
 };
 
 // Images stay small: under qemu each 128 bytes of HVX output costs about 2.5 us.
@@ -75,6 +75,79 @@ const hash_case kCases[] = {
                                  i32(-300), i32(0), u32(2)}},
     {m::thresh, "u8_to_zero_inv", 7, {desc(256, 77, 3, 3), seq(256 * 3), desc(256, 77, 3, 3), seq(256 * 3),
                                       i32(77), i32(0), u32(4)}},
+    // Sobel jobs: inp, stride, width, height, outp, sobelmode[, bordermode]; every mode and border, an odd
+    // count of rows, a stride wider than the row, the fewest rows, and refusals (mode 3, border 2, 2 rows).
+    {m::sobel8u, "dx_wide_stride", 6, {seq(384 * 7), i32(384), i32(256), i32(7), seq(384 * 7), u32(0)}},
+    {m::sobel8u, "dy", 6, {seq(256 * 6), i32(256), i32(256), i32(6), seq(256 * 6), u32(1)}},
+    {m::sobel8u, "dxy_3_rows", 6, {seq(128 * 3), i32(128), i32(128), i32(3), seq(128 * 3), u32(2)}},
+    {m::sobel8u, "bad_mode", 6, {seq(128 * 4), i32(128), i32(128), i32(4), seq(128 * 4), u32(3)}},
+    {m::sobel16s, "dx_constant", 7, {seq(384 * 6), i32(384), i32(256), i32(6), seq(384 * 6), u32(0), u32(0)}},
+    {m::sobel16s, "dy_replicate", 7, {seq(256 * 8), i32(256), i32(256), i32(8), seq(256 * 8), u32(1), u32(1)}},
+    {m::sobel16s, "dxy_reflect", 7, {seq(128 * 4), i32(128), i32(128), i32(4), seq(128 * 4), u32(2), u32(4)}},
+    {m::sobel16s, "bad_border", 7, {seq(128 * 4), i32(128), i32(128), i32(4), seq(128 * 4), u32(0), u32(2)}},
+    {m::sobel32f, "dy_constant", 7, {seq(256 * 5), i32(256), i32(128), i32(5), seq(256 * 5), u32(1), u32(0)}},
+    {m::sobel32f, "dxy_replicate", 7, {seq(128 * 6), i32(128), i32(128), i32(6), seq(128 * 6), u32(2), u32(1)}},
+    {m::sobel32f, "dx_reflect", 7, {seq(256 * 4), i32(256), i32(256), i32(4), seq(256 * 4), u32(0), u32(4)}},
+    {m::sobel32f, "two_rows", 7, {seq(128 * 2), i32(128), i32(128), i32(2), seq(128 * 2), u32(0), u32(1)}},
+    {m::sobel, "nothing", 9, {desc(256, 200, 5), seq(256 * 5), desc(256, 200, 5, 1, 3), seq(256 * 5), i32(1),
+                              i32(1), i32(0), i32(3), i32(1)}},
+    // conv3x3a328u: inp, stride_i, width, height, mask (12 random bytes), shift, outp, stride_o.
+    {m::conv3x3a328u, "shift_5", 8, {seq(384 * 7), i32(384), i32(256), i32(7), seq(12), i32(5), seq(256 * 7),
+                                     i32(256)}},
+    {m::conv3x3a328u, "shift_19_3_rows", 8, {seq(256 * 3), i32(256), i32(128), i32(3), seq(12), i32(19),
+                                             seq(384 * 3), i32(384)}},
+    {m::conv3x3a328u, "short_mask", 8, {seq(256 * 4), i32(256), i32(128), i32(4), seq(11), i32(0), seq(256 * 4),
+                                        i32(256)}},
+    // gaussianBlur: desc_in, desc_out, src, dst, kernel_size; u8, u16 and float outputs.
+    {m::gaussianBlur, "k3_u8", 5, {desc(128, 100, 9), desc(128, 100, 9), seq(128 * 9), seq(128 * 9), i32(3)}},
+    {m::gaussianBlur, "k5_u16", 5, {desc(256, 150, 9), desc(512, 150, 9, 1, 3), seq(256 * 9), seq(512 * 9),
+                                    i32(5)}},
+    {m::gaussianBlur, "k7_f32", 5, {desc(128, 128, 10), desc(512, 128, 10, 1, 5), seq(128 * 10), seq(512 * 10),
+                                    i32(7)}},
+    {m::gaussianBlur, "k9", 5, {desc(128, 100, 9), desc(128, 100, 9), seq(128 * 9), seq(128 * 9), i32(9)}},
+    // median_blur_3x3: one descriptor for both images; the row's next vector inside the stride, then not.
+    {m::median_blur_3x3, "padded", 3, {desc(256, 150, 7), seq(256 * 7), seq(256 * 7)}},
+    {m::median_blur_3x3, "full_rows", 3, {desc(128, 128, 4), seq(128 * 4), seq(128 * 4)}},
+    // median3x3: inp, width, height, stride, outp (packed), borderType, borderValue.
+    {m::median3x3, "replicate", 7, {seq(50 * 9), u32(37), u32(9), u32(50), seq(37 * 9), u32(0), u32(0)}},
+    {m::median3x3, "constant_300", 7, {seq(64 * 5), u32(64), u32(5), u32(64), seq(64 * 5), u32(1), u32(300)}},
+    {m::median3x3, "replicate_2", 7, {seq(20 * 3), u32(19), u32(3), u32(20), seq(19 * 3), u32(2), u32(9)}},
+    {m::median3x3, "border_256", 7, {seq(40 * 4), u32(40), u32(4), u32(40), seq(40 * 4), u32(256), u32(0)}},
+    // morphOp: srcDesc, src, dstDesc, dst, kernel, iterations, kernelShape, borderType, borderValue, op;
+    // each table row, both borders, depths 0, 2 and 3 (element size = stride / cols), refusals.
+    {m::morphOp, "u8_erode_rect_const", 10, {desc(256, 200, 7), seq(256 * 7), desc(256, 200, 7), seq(256 * 7),
+                                            i32(3), i32(1), i32(0), i32(0), i32(300), u32(0)}},
+    {m::morphOp, "u8_dilate_rect_repl", 10, {desc(128, 128, 6), seq(128 * 6), desc(128, 128, 6), seq(128 * 6),
+                                            i32(3), i32(1), i32(0), i32(1), i32(0), u32(1)}},
+    {m::morphOp, "u16_erode_cross_repl", 10, {desc(256, 100, 5, 1, 2), seq(256 * 5), desc(256, 100, 5, 1, 2),
+                                             seq(256 * 5), i32(3), i32(1), i32(2), i32(1), i32(0), u32(0)}},
+    {m::morphOp, "i16_dilate_cross_const", 10, {desc(256, 128, 8, 1, 3), seq(256 * 8), desc(256, 128, 8, 1, 3),
+                                               seq(256 * 8), i32(3), i32(1), i32(2), i32(0), i32(-40000), u32(1)}},
+    {m::morphOp, "u8_3_rows", 10, {desc(128, 128, 3), seq(128 * 3), desc(128, 128, 3), seq(128 * 3), i32(3),
+                                  i32(1), i32(2), i32(0), i32(-5), u32(0)}},
+    {m::morphOp, "depth_1", 10, {desc(128, 128, 4, 1, 1), seq(128 * 4), desc(128, 128, 4, 1, 1), seq(128 * 4),
+                                i32(3), i32(1), i32(0), i32(0), i32(0), u32(0)}},
+    {m::morphOp, "row_4", 10, {desc(128, 128, 4), seq(128 * 4), desc(128, 128, 4), seq(128 * 4), i32(3), i32(1),
+                              i32(3), i32(0), i32(0), u32(1)}},
+    // morphologyEx: srcDesc, src, tmpDesc, tmp, dstDesc, dst, kernel, iterations, shape, border, value, op.
+    {m::morphologyEx, "u8_open", 12, {desc(128, 128, 5), seq(128 * 5), desc(128, 128, 5), seq(128 * 5),
+                                      desc(128, 128, 5), seq(128 * 5), i32(3), i32(1), i32(0), i32(1), i32(0), u32(2)}},
+    {m::morphologyEx, "u8_close_cross", 12, {desc(256, 200, 6), seq(256 * 6), desc(256, 200, 6), seq(256 * 6),
+                                             desc(256, 200, 6), seq(256 * 6), i32(3), i32(1), i32(2), i32(0),
+                                             i32(7), u32(3)}},
+    {m::morphologyEx, "i16_gradient", 12, {desc(256, 128, 5, 1, 3), seq(256 * 5), desc(256, 128, 5, 1, 3),
+                                           seq(256 * 5), desc(256, 128, 5, 1, 3), seq(256 * 5), i32(3), i32(1),
+                                           i32(0), i32(0), i32(-100), u32(4)}},
+    {m::morphologyEx, "u16_tophat", 12, {desc(256, 128, 4, 1, 2), seq(256 * 4), desc(256, 128, 4, 1, 2),
+                                         seq(256 * 4), desc(256, 128, 4, 1, 2), seq(256 * 4), i32(3), i32(1),
+                                         i32(2), i32(1), i32(0), u32(5)}},
+    {m::morphologyEx, "u8_blackhat", 12, {desc(128, 128, 7), seq(128 * 7), desc(128, 128, 7), seq(128 * 7),
+                                          desc(128, 128, 7), seq(128 * 7), i32(3), i32(1), i32(0), i32(0),
+                                          i32(255), u32(6)}},
+    {m::morphologyEx, "erode_op", 12, {desc(128, 128, 4), seq(128 * 4), desc(128, 128, 4), seq(128 * 4),
+                                       desc(128, 128, 4), seq(128 * 4), i32(3), i32(1), i32(0), i32(0), i32(0),
+                                       u32(0)}},
+    {m::filter2D, "nothing", 6, {desc(128, 100, 4), seq(128 * 4), desc(128, 100, 4), seq(128 * 4), seq(9), i32(3)}},
     {m::get_kernel_execution_time, "plain", 4, {arg{}, arg{}, seq(16), u8(1)}},
     {m::DoesNothing_ButLooksCool, "plain", 0, {}},
     {m::DoesNothing_ButLooksCool_ProEdition, "plain", 0, {}},

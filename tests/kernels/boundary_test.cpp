@@ -76,6 +76,42 @@ int box(const corvane_mbufd* d, corvane_mbuf* b, int ddepth) {
   return corvane_boxfilter(&d[0], &b[0], ddepth, 3, 5, 1, &d[1], &b[1], &d[2], &b[2]);
 }
 
+// A stride one vector narrower than the row.
+corvane_mbufd stride_below_row(corvane_mbufd d) { return d.stride = d.cols - 128, d; }
+
+// The raw-pointer filters read their stride, width and height from descs[0] (stride, cols,
+// rows), so that the descriptor faults reach them too; conv3x3a328u's output stride is
+// descs[1].stride.
+int sobel(const corvane_mbufd* d, corvane_mbuf* b, int bytes, uint32_t mode, uint32_t border) {
+  const corvane_mbufd& g = d[0];
+  if (bytes == 1) return corvane_sobel8u(b[0].mem, b[0].memLen, g.stride, g.cols, g.rows, b[1].mem, b[1].memLen, mode);
+  if (bytes == 2)
+    return corvane_sobel16s(b[0].mem, b[0].memLen, g.stride, g.cols, g.rows, reinterpret_cast<int16_t*>(b[1].mem),
+                            b[1].memLen / 2, mode, border);
+  return corvane_sobel32f(b[0].mem, b[0].memLen, g.stride, g.cols, g.rows, reinterpret_cast<int32_t*>(b[1].mem),
+                          b[1].memLen / 4, mode, border);
+}
+
+const uint8_t kMask[12] = {1, 2, 1, 0, 0, 0, 0, 0, 0xff, 0xfe, 0xff, 0};
+
+int conv(const corvane_mbufd* d, corvane_mbuf* b, int mask_len = 12) {
+  return corvane_conv3x3a328u(b[0].mem, b[0].memLen, d[0].stride, d[0].cols, d[0].rows, kMask, mask_len, 2,
+                              b[1].mem, b[1].memLen, d[1].stride);
+}
+
+int median3x3(const corvane_mbufd* d, corvane_mbuf* b, uint32_t border) {
+  return corvane_median3x3(b[0].mem, b[0].memLen, uint32_t(d[0].cols), uint32_t(d[0].rows), uint32_t(d[0].stride),
+                           b[1].mem, b[1].memLen, border, 7);
+}
+
+int morph(const corvane_mbufd* d, corvane_mbuf* b, uint32_t op) {
+  return corvane_morphOp(&d[0], &b[0], &d[0], &b[1], 3, 1, 2, 0, 9, op);
+}
+
+int morph_ex(const corvane_mbufd* d, corvane_mbuf* b, uint32_t op) {
+  return corvane_morphologyEx(&d[0], &b[0], &d[0], &b[1], &d[0], &b[2], 3, 1, 0, 1, 0, op);
+}
+
 // Sizes chosen so that a row fills its stride in both vector lengths, which makes every
 // byte of the reach count; the box filter (3x5, H = 5) leaves its last 2 output rows
 // unwritten, and its ring holds 2 * 5 rows of two 16-bit (8-bit input) or 32-bit
@@ -125,6 +161,41 @@ std::vector<method_case> cases() {
       {"thresh", {2, 4}, {desc(256, 256, 4)}, {1024, 1024}, {true, true},
        {negative_stride, huge_image, no_channels, huge_row},
        [](const corvane_mbufd* d, corvane_mbuf* b) { return corvane_thresh(&d[0], &b[0], &d[0], &b[1], 9, 200, 0); }},
+      // Sobel jobs: input (height - 1) * stride + width bytes; the 8-bit output leaves its last row
+      // unwritten, the 16- and 32-bit ones write every row, stride elements apart.
+      {"sobel8u", {2, 4}, {desc(384, 256, 6)}, {5 * 384 + 256, 4 * 384 + 256}, {true, true},
+       {negative_stride, negative_rows, huge_image, stride_below_row},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return sobel(d, b, 1, 0, 0); }},
+      {"sobel8u 3 rows", {2, 4}, {desc(128, 128, 3)}, {2 * 128 + 128, 128 + 128}, {true, true}, {},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return sobel(d, b, 1, 2, 0); }},
+      {"sobel16s", {2, 4}, {desc(384, 256, 6)}, {5 * 384 + 256, 2 * (5 * 384 + 256)}, {true, true},
+       {negative_stride, negative_rows, huge_image, stride_below_row},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return sobel(d, b, 2, 1, 1); }},
+      {"sobel32f", {2, 4}, {desc(256, 128, 5)}, {4 * 256 + 128, 4 * (4 * 256 + 128)}, {true, true},
+       {negative_stride, negative_rows, huge_image, stride_below_row},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return sobel(d, b, 4, 2, 4); }},
+      // The mask comes from the caller's constant: only the image buffers are guarded here.
+      {"conv3x3a328u", {2, 4}, {desc(384, 256, 6), desc(512, 0, 0)}, {5 * 384 + 256, 4 * 512 + 256}, {true, true},
+       {negative_stride, negative_rows, huge_image, stride_below_row},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return conv(d, b); }},
+      // 37 x 9 pixels 50 bytes apart in, packed 37 bytes a row out; the scalar core aligns nothing.
+      {"median3x3", {0}, {desc(50, 37, 9)}, {8 * 50 + 37, 37 * 9}, {true, true},
+       {negative_stride, negative_rows, huge_image},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return median3x3(d, b, 1); }},
+      // Two 64-byte vectors a row; the u8 rows 1 to 5 are then widened to u16 over all 7 rows.
+      {"gaussianBlur", {1, 4}, {desc(128, 100, 7), desc(256, 100, 7, 1, 3)}, {7 * 128, 7 * 256}, {true, true},
+       {negative_stride, huge_image},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return corvane_gaussianBlur(&d[0], &d[1], &b[0], &b[1], 3); }},
+      {"median_blur_3x3", {1, 4}, {desc(128, 128, 5)}, {5 * 128, 3 * 128 + 128}, {true, true},
+       {negative_stride, huge_image},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return corvane_median_blur_3x3(&d[0], &b[0], &b[1]); }},
+      // Every row is written, two 128-byte vectors of u8 or one of u16.
+      {"morphOp u8", {2, 4}, {desc(256, 200, 5)}, {5 * 256, 5 * 256}, {true, true}, {negative_stride, huge_image},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return morph(d, b, 0); }},
+      {"morphOp u16", {2, 4}, {desc(128, 64, 3, 1, 2)}, {3 * 128, 3 * 128}, {true, true},
+       {negative_stride, huge_image}, [](const corvane_mbufd* d, corvane_mbuf* b) { return morph(d, b, 1); }},
+      {"morphologyEx", {2, 4}, {desc(256, 256, 4)}, {4 * 256, 4 * 256, 4 * 256}, {true, true, true},
+       {negative_stride, huge_image}, [](const corvane_mbufd* d, corvane_mbuf* b) { return morph_ex(d, b, 3); }},
   };
 }
 
@@ -224,6 +295,70 @@ TEST(Boundary, RowsOfNoWidthEndAtOnce) {
   test::ScopedUnits dual(4);  // negative rows: no rows, and no row -2 for the second worker
   const corvane_mbufd negative{256, 256, -5, 1, 0, 0, 0, 0, 0};
   EXPECT_EQ(0, corvane_thresh(&negative, &empty, &negative, &empty, 1, 2, 0));
+}
+
+// Arguments a filter does not serve answer their code with every byte as it was; the
+// entries without a kernel answer 0 and touch nothing, whatever they are given.
+TEST(Boundary, UnservedArgumentsWriteNothing) {
+  const corvane_mbufd image = desc(256, 256, 4), absurd = desc(-128, INT_MAX, -1, 0, 9);
+  const struct {
+    const char* what;
+    int units, answer;
+    std::vector<int> lengths;
+    std::function<int(corvane_mbuf*)> call;
+  } table[] = {
+      {"sobel8u of 2 rows", 4, 14, {512, 512},
+       [&](corvane_mbuf* b) {
+         const corvane_mbufd two_rows = desc(256, 256, 2);
+         return sobel(&two_rows, b, 1, 0, 0);
+       }},
+      {"sobel8u mode 3", 4, 4, {1024, 1024}, [&](corvane_mbuf* b) { return sobel(&image, b, 1, 3, 0); }},
+      {"sobel16s border 2", 4, 4, {1024, 2048}, [&](corvane_mbuf* b) { return sobel(&image, b, 2, 0, 2); }},
+      {"sobel32f border 3", 2, 4, {1024, 4096}, [&](corvane_mbuf* b) { return sobel(&image, b, 4, 0, 3); }},
+      {"conv3x3a328u mask of 11", 4, 14, {1024, 1024},
+       [&](corvane_mbuf* b) {
+         const corvane_mbufd d[] = {image, image};
+         return conv(d, b, 11);
+       }},
+      {"median3x3 border 3", 0, 1, {1024, 1024}, [&](corvane_mbuf* b) { return median3x3(&image, b, 3); }},
+      {"median3x3 border 256", 0, 1, {1024, 1024}, [&](corvane_mbuf* b) { return median3x3(&image, b, 256); }},
+      {"gaussianBlur 9x9", 1, 4, {1024, 1024},
+       [&](corvane_mbuf* b) { return corvane_gaussianBlur(&image, &image, &b[0], &b[1], 9); }},
+      {"gaussianBlur without units", 0, 1, {1024, 1024},
+       [&](corvane_mbuf* b) { return corvane_gaussianBlur(&image, &image, &b[0], &b[1], 3); }},
+      {"median_blur_3x3 without units", 0, 1, {1024, 1024},
+       [&](corvane_mbuf* b) { return corvane_median_blur_3x3(&image, &b[0], &b[1]); }},
+      {"morphOp depth 1", 4, 4, {1024, 1024},
+       [&](corvane_mbuf* b) {
+         const corvane_mbufd i8 = desc(256, 256, 4, 1, 1);
+         return morph(&i8, b, 0);
+       }},
+      {"morphOp dilate with shape 3", 4, 4, {1024, 1024},
+       [&](corvane_mbuf* b) { return corvane_morphOp(&image, &b[0], &image, &b[1], 3, 1, 3, 0, 0, 1); }},
+      {"morphologyEx erode", 4, 0, {1024, 1024, 1024}, [&](corvane_mbuf* b) { return morph_ex(&image, b, 0); }},
+      {"morphologyEx depth 4", 4, 0, {1024, 1024, 1024},
+       [&](corvane_mbuf* b) {
+         const corvane_mbufd i32 = desc(256, 64, 4, 1, 4);
+         return morph_ex(&i32, b, 2);
+       }},
+      {"sobel", 4, 0, {16, 16},
+       [&](corvane_mbuf* b) { return corvane_sobel(&absurd, &b[0], &absurd, &b[1], 9, 1, 1, 7, 99); }},
+      {"filter2D", 4, 0, {16, 16},
+       [&](corvane_mbuf* b) {
+         return corvane_filter2D(&absurd, &b[0], &absurd, &b[1], reinterpret_cast<const int16_t*>(b[0].mem), 8, 1);
+       }},
+  };
+  for (const auto& t : table) {
+    test::ScopedUnits scoped(t.units);
+    std::vector<std::unique_ptr<Guarded>> buffers;
+    std::vector<corvane_mbuf> records;
+    for (int len : t.lengths) {
+      buffers.push_back(std::make_unique<Guarded>(size_t(len), 0));
+      records.push_back(buffers.back()->record);
+    }
+    EXPECT_EQ(t.answer, t.call(records.data())) << t.what;
+    for (const auto& b : buffers) EXPECT_TRUE(b->untouched()) << t.what;
+  }
 }
 
 }  // namespace

@@ -8,6 +8,7 @@
 #include <cstdio>
 #include <cstring>
 #include <fstream>
+#include <functional>
 #include <initializer_list>
 #include <iterator>
 #include <string>
@@ -87,7 +88,7 @@ TEST_F(CliRun, BadArgumentsFailAndLeaveTheOutputAlone) {
       {"run", ""},
       {"run identity " + in, ""},
       {"run identity " + in + " " + out + " extra", ""},
-      {"run sobel " + in + " " + out, ""},
+      {"run pyrDown " + in + " " + out, ""},
       {"run identity --mode quick " + in + " " + out, ""},
       {"run identity --mode", ""},
       {"run identity --ksize 3 " + in + " " + out, ""},
@@ -234,6 +235,110 @@ TEST_F(CliRun, ThreshAndAddGiveTheElementsOfTheirFormulas) {
   for (int r = 0; r < 3; ++r)
     for (size_t i = 0; i < x.row_bytes(); ++i)
       ASSERT_EQ(std::min(x.row(r)[i] + y.row(r)[i], 255), sum.row(r)[i]) << "row " << r << " byte " << i;
+}
+
+TEST_F(CliRun, FiltersTakeTheirOptionsAndFiles) {
+  Image grey(150, 9, 1, corvane::client::U8), g16(70, 6, 1, corvane::client::U16), rgb(20, 5, 3, corvane::client::U8);
+  grey.fill_random(21);
+  g16.fill_random(22);
+  corvane::tools::write_png(path("grey.png"), grey);
+  corvane::tools::write_png(path("g16.png"), g16);
+  corvane::tools::write_png(path("rgb.png"), rgb);
+  const std::string out = path("out.png"), files = path("grey.png") + " " + out;
+  const struct {
+    std::string args;
+    int status;
+    std::string says;
+  } table[] = {
+      {"sobel --deriv dxy --depth 32f --border constant " + files, 0, "sobel dxy 32f constant"},
+      {"sobel --mode dhvx " + files, 0, "DualHVX"},
+      {"gaussian --ksize 7 " + files, 0, "SingleHVX"},
+      {"median3x3 --mode scalar " + files, 0, "Scalar"},
+      {"morph --op blackhat --shape cross " + path("g16.png") + " " + out, 0, "morphologyEx blackhat cross"},
+      {"conv3x3 --mask=1,2,1,0,0,0,-1,-2,-1 --shift 2 " + files, 0, "DualHVX"},
+      {"sobel --border constant " + files, 2, "goes with --depth"},
+      {"sobel --deriv dz " + files, 2, "dx, dy, dxy"},
+      {"sobel --mode shvx " + files, 2, "no SingleHVX mode"},
+      {"sobel " + path("rgb.png") + " " + out, 1, "grey 8-bit"},
+      {"gaussian --ksize 9 " + files, 2, "3, 5 or 7"},
+      {"median --border constant " + files, 2, "not an option of median"},
+      {"median3x3 --value 3 " + files, 2, "goes with --border constant"},
+      {"morph " + files, 2, "wants --op"},
+      {"morph --op trunc " + files, 2, "erode"},
+      {"thresh --thresh 1 --op erode " + files, 2, "binary"},
+      {"conv3x3 --mask 1,2,3 " + files, 2, "9 numbers"},
+      {"conv3x3 --mask 0,0,0,0,200,0,0,0,0 " + files, 2, "-128 to 127"},
+      {"conv3x3 --mask 0,0,0,0,1,0,0,0,0 --shift 16 " + files, 2, "0 to 15"},
+  };
+  for (const auto& t : table) {
+    SCOPED_TRACE("corvane run " + t.args);
+    std::ofstream(out) << "precious";
+    EXPECT_EQ(t.status, cli("run " + t.args)) << output_;
+    EXPECT_NE(std::string::npos, output_.find(t.says)) << output_;
+    EXPECT_EQ(t.status != 0, bytes("out.png") == "precious");
+  }
+}
+
+// A uniform image shows each filter's edges: the right edge, past which the CLI pads the
+// rows, must come out as the left one does.
+TEST_F(CliRun, FiltersGiveTheBorderOnEveryEdge) {
+  Image flat(7, 5, 1, corvane::client::U8);
+  flat.fill(100);
+  corvane::tools::write_png(path("flat.png"), flat);
+  auto frame = [](int x, int y) { return x == 0 || x == 6 || y == 0 || y == 4; };
+  auto side = [](int x, int) { return x == 0 || x == 6; };
+  const struct {
+    std::string args;
+    std::function<int(int x, int y)> want;
+  } table[] = {
+      {"gaussian --ksize 3", [&](int x, int y) { return y == 0 || y == 4 ? 0 : side(x, y) ? 75 : 100; }},
+      {"median", [](int, int y) { return y == 0 || y == 4 ? 0 : 100; }},
+      // The corners see 4 pixels and 5 of the border, 300 & 255 = 44.
+      {"median3x3 --border constant --value 300",
+       [](int x, int y) { return (x == 0 || x == 6) && (y == 0 || y == 4) ? 44 : 100; }},
+      {"sobel", [](int x, int y) { return y > 0 && y < 4 && x == 0 ? 255 : 0; }},  // 400 at the left, -400 right
+      {"sobel --depth 16s --border constant", [&](int x, int y) { return side(x, y) ? 255 : 0; }},
+      {"sobel --depth 32f --deriv dy --border replicate", [](int, int) { return 0; }},
+      {"sobel --depth 16s --deriv dxy --border reflect101", [](int, int) { return 0; }},
+      {"morph --op erode --border constant", [&](int x, int y) { return frame(x, y) ? 0 : 100; }},
+      {"morph --op dilate --shape cross --border constant --value 999", [&](int x, int y) {
+         return frame(x, y) ? 255 : 100; }},
+      {"morph --op gradient", [](int, int) { return 0; }},
+      {"conv3x3 --mask 0,0,0,0,1,0,0,0,0", [&](int x, int y) { return x == 0 || y == 0 || y == 4 ? 0 : 100; }},
+      {"conv3x3 --mask 1,1,1,1,1,1,1,1,1 --shift 3",
+       [&](int x, int y) { return x == 0 || y == 0 || y == 4 ? 0 : x == 6 ? 600 >> 3 : 900 >> 3; }},
+  };
+  for (const auto& t : table) {
+    SCOPED_TRACE("corvane run " + t.args);
+    ASSERT_EQ(0, cli("run " + t.args + " " + path("flat.png") + " " + path("out.png"))) << output_;
+    const Image out = corvane::tools::read_png(path("out.png"));
+    ASSERT_EQ(7, out.cols());
+    ASSERT_EQ(5, out.rows());
+    for (int y = 0; y < 5; ++y)
+      for (int x = 0; x < 7; ++x) EXPECT_EQ(t.want(x, y), out.row(y)[x]) << "x " << x << ", y " << y;
+  }
+}
+
+TEST_F(CliRun, MorphSubtractsOnTheHost) {
+  // One bright pixel on the right edge, with the edge replicated: the closing spreads it along
+  // the last column, so the black hat finds the pixels above and below it.
+  write_samples(path("peak.png"), 4, 3, 1, corvane::client::U8, {10, 10, 10, 10, 10, 10, 10, 200, 10, 10, 10, 10});
+  const struct {
+    const char* op;
+    std::function<int(int x, int y)> want;
+  } table[] = {
+      {"gradient", [](int x, int) { return x >= 2 ? 190 : 0; }},
+      {"tophat", [](int x, int y) { return x == 3 && y == 1 ? 190 : 0; }},
+      {"blackhat", [](int x, int y) { return x == 3 && y != 1 ? 190 : 0; }},
+  };
+  for (const auto& t : table) {
+    SCOPED_TRACE(t.op);
+    ASSERT_EQ(0, cli(std::string("run morph --op ") + t.op + " " + path("peak.png") + " " + path("out.png")))
+        << output_;
+    const Image out = corvane::tools::read_png(path("out.png"));
+    for (int y = 0; y < 3; ++y)
+      for (int x = 0; x < 4; ++x) EXPECT_EQ(t.want(x, y), out.row(y)[x]) << "x " << x << ", y " << y;
+  }
 }
 
 TEST_F(CliRun, MethodsListsEveryMethodWithItsModes) {

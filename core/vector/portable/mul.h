@@ -14,11 +14,21 @@ CORVANE_PORTABLE_INLINE namespace portable {
 
 namespace impl {
 
-// A chunk of lanes L whose lane j holds lane j mod n of the scalar word.
+// A chunk of lanes L whose lane j holds lane j mod n of the scalar word. Built lane by
+// lane only when the word's lanes differ and are narrower than L: a word of lanes as
+// wide as L is the word repeated, and a word of equal lanes one broadcast, which
+// matters where a kernel multiplies by a weight known only at run time.
 template <class L, class S> inline chunk<L> factor_chunk(S rt) {
-  chunk<L> f = {};
-  for (int j = 0; j < static_cast<int>(chunk_bytes / sizeof(L)); ++j) f[j] = static_cast<L>(rt[j % S::lanes]);
-  return f;
+  if constexpr (sizeof(L) == sizeof(typename S::lane_t)) {
+    return reinterpret_cast<chunk<L>>(chunk<uint32_t>{} + rt.value);  // lane j is byte/half j mod n, as stored
+  } else {
+    bool equal = true;
+    for (int j = 1; j < S::lanes; ++j) equal = equal && rt[j] == rt[0];
+    if (equal) return chunk<L>{} + static_cast<L>(rt[0]);
+    chunk<L> f = {};
+    for (int j = 0; j < static_cast<int>(chunk_bytes / sizeof(L)); ++j) f[j] = static_cast<L>(rt[j % S::lanes]);
+    return f;
+  }
 }
 }  // namespace impl
 
