@@ -8,6 +8,7 @@
 #include "core/vector/ops.h"
 #include "kernels/filters/conv3x3.h"
 #include "kernels/filters/edge_load.h"
+#include "kernels/filters/pair_ops.h"
 
 namespace hvx {
 namespace conv3x3 {
@@ -32,12 +33,6 @@ inline split_mask split(const int8_t (&mask)[12]) {
     m.high[i] = static_cast<int8_t>((mask[i] - m.low[i]) / 16);
   }
   return m;
-}
-
-// acc + x * w in each half of a pair of 16-bit lanes.
-inline wvi16 add_scaled(const wvi16& acc, const wvi16& x, int8_t w) {
-  const vi8x4 f(w, w, w, w);
-  return vcombine(vmpyiacc(hi(acc), hi(x), f), vmpyiacc(lo(acc), lo(x), f));
 }
 
 // 64 outputs from their partial sums: (16 A + B) >> shift cut to 16 bits.
@@ -67,7 +62,7 @@ CORVANE_FLAT void conv_row(const job_args& a, const split_mask& m, int y) {
       auto tap = [&](vec x, int i) {
         const int8_t low = m.low[i], high = m.high[i];
         if (low == 0 && high == 0) return;
-        const wvi16 p = vcast<wvi16>(vunpack(vu8(x)));
+        const wvi16 p = widen_u8<M>(x);
         if (low != 0) sum_low = add_scaled(sum_low, p, low);
         if (high != 0) sum_high = add_scaled(sum_high, p, high);
       };

@@ -5,6 +5,7 @@
 // 7x7 horizontal pass adds its symmetric pairs in 16 bits and weights them in 32.
 #include "core/vector/ops.h"
 #include "kernels/filters/gaussian.h"
+#include "kernels/filters/pair_ops.h"
 
 namespace hvx {
 namespace gaussian {
@@ -18,12 +19,7 @@ typedef vi32_t<M> vi32;
 typedef wvi16_t<M> wvi16;
 typedef wvi32_t<M> wvi32;
 
-inline vi8x4 weight(int w) { return vi8x4(int8_t(w), int8_t(w), int8_t(w), int8_t(w)); }
-inline wvi16 widen(vec x) { return vcast<wvi16>(vunpack(vu8(x))); }
-// acc + x * w, lane by lane, in each half of a pair.
-template <class W> inline W add_scaled(const W& acc, const W& x, int w) {
-  return vcombine(vmpyiacc(hi(acc), hi(x), weight(w)), vmpyiacc(lo(acc), lo(x), weight(w)));
-}
+inline wvi16 widen(vec x) { return widen_u8<M>(x); }
 
 // Pixel i - d and pixel i + d of the window's current pair, d lanes away.
 inline wvi16 left_by(const wvi16& c, const wvi16& p, int d) {

@@ -7,6 +7,7 @@
 #define CORVANE_KERNELS_FILTERS_SOBEL_IMPL_H
 
 #include "core/vector/ops.h"
+#include "kernels/filters/pair_ops.h"
 #include "kernels/filters/sobel.h"
 
 namespace hvx {
@@ -33,23 +34,21 @@ template <mode_enum M, int Right> inline gen_vec<M> after_last(gen_vec<M> last) 
   if constexpr (Right == right_reflect) return vlalign(zero, last, 2);
 }
 
-template <mode_enum M> inline wvi16_t<M> widen(gen_vec<M> x) { return vcast<wvi16_t<M>>(vunpack(vu8_t<M>(x))); }
-
 // The derivative at each lane from the left, own and right neighbours of rows y - 1,
 // y and y + 1.
 template <mode_enum M, int D>
 inline wvi16_t<M> derivative_of(const gen_vec<M> (&l)[3], const gen_vec<M> (&c)[3], const gen_vec<M> (&r)[3]) {
   if constexpr (D == d_x) {
-    const wvi16_t<M> d0 = vsub_w(widen<M>(r[0]), widen<M>(l[0])), d1 = vsub_w(widen<M>(r[1]), widen<M>(l[1])),
-                     d2 = vsub_w(widen<M>(r[2]), widen<M>(l[2]));
+    const wvi16_t<M> d0 = vsub_w(widen_u8<M>(r[0]), widen_u8<M>(l[0])), d1 = vsub_w(widen_u8<M>(r[1]), widen_u8<M>(l[1])),
+                     d2 = vsub_w(widen_u8<M>(r[2]), widen_u8<M>(l[2]));
     return vadd_w(vadd_w(d0, d2), vadd_w(d1, d1));
   } else if constexpr (D == d_y) {
-    const wvi16_t<M> c0 = widen<M>(c[0]), c2 = widen<M>(c[2]);
-    const wvi16_t<M> h0 = vadd_w(vadd_w(widen<M>(l[0]), widen<M>(r[0])), vadd_w(c0, c0));
-    const wvi16_t<M> h2 = vadd_w(vadd_w(widen<M>(l[2]), widen<M>(r[2])), vadd_w(c2, c2));
+    const wvi16_t<M> c0 = widen_u8<M>(c[0]), c2 = widen_u8<M>(c[2]);
+    const wvi16_t<M> h0 = vadd_w(vadd_w(widen_u8<M>(l[0]), widen_u8<M>(r[0])), vadd_w(c0, c0));
+    const wvi16_t<M> h2 = vadd_w(vadd_w(widen_u8<M>(l[2]), widen_u8<M>(r[2])), vadd_w(c2, c2));
     return vsub_w(h2, h0);
   } else {
-    return vadd_w(vsub_w(widen<M>(l[0]), widen<M>(r[0])), vsub_w(widen<M>(r[2]), widen<M>(l[2])));
+    return vadd_w(vsub_w(widen_u8<M>(l[0]), widen_u8<M>(r[0])), vsub_w(widen_u8<M>(r[2]), widen_u8<M>(l[2])));
   }
 }
 

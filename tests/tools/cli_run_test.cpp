@@ -29,6 +29,25 @@ class CliRun : public testing::Test {
   }
   std::string path(const std::string& name) const { return dir_ + name; }
 
+  struct run_case {
+    std::string args;
+    int status;
+    std::string says;  // a line the output must hold
+  };
+  // Each `corvane run` of the table: its status, a line of its output, and out.png
+  // rewritten only by a run that succeeds and names it.
+  template <size_t N> void check_runs(const run_case (&table)[N]) {
+    const std::string out = path("out.png");
+    for (const run_case& t : table) {
+      SCOPED_TRACE("corvane run " + t.args);
+      std::ofstream(out) << "precious";
+      EXPECT_EQ(t.status, cli("run " + t.args)) << output_;
+      EXPECT_NE(std::string::npos, output_.find(t.says)) << output_;
+      const bool writes = t.status == 0 && t.args.find(out) != std::string::npos;
+      EXPECT_EQ(!writes, bytes("out.png") == "precious");
+    }
+  }
+
   // The exit status of `corvane <args>`; its output goes to `output_`.
   int cli(const std::string& args, const std::string& env = "") {
     const std::string log = path("log.txt");
@@ -166,11 +185,7 @@ TEST_F(CliRun, PixelwiseMethodsTakeTheirOptionsAndFiles) {
   corvane::tools::write_png(path("g16.png"), g16);
   const std::string a = path("a.png"), b = path("b.png"), out = path("out.png");
   const std::string ab = a + " " + b + " " + out, a_out = a + " " + out;
-  const struct {
-    std::string args;
-    int status;
-    std::string says;  // a line the output must hold
-  } table[] = {
+  const run_case table[] = {
       {"thresh --thresh 1000 --op trunc " + path("g16.png") + " " + out, 0, "DualHVX"},
       {"thresh --thresh=5 --op tozero_inv " + path("big.png") + " " + out, 0, ""},
       {"convertScaleAbs --alpha 2 --beta -3 " + a_out, 0, "DualHVX"},
@@ -199,14 +214,7 @@ TEST_F(CliRun, PixelwiseMethodsTakeTheirOptionsAndFiles) {
       {"hvx_sum " + a_out, 2, ""},
       {"hvx_sum --out u8 " + a, 2, ""},
   };
-  for (const auto& t : table) {
-    SCOPED_TRACE("corvane run " + t.args);
-    std::ofstream(out) << "precious";
-    EXPECT_EQ(t.status, cli("run " + t.args)) << output_;
-    EXPECT_NE(std::string::npos, output_.find(t.says)) << output_;
-    const bool writes = t.status == 0 && t.args.find(out) != std::string::npos;
-    EXPECT_EQ(!writes, bytes("out.png") == "precious");
-  }
+  check_runs(table);
 }
 
 TEST_F(CliRun, ThreshAndAddGiveTheElementsOfTheirFormulas) {
@@ -245,11 +253,7 @@ TEST_F(CliRun, FiltersTakeTheirOptionsAndFiles) {
   corvane::tools::write_png(path("g16.png"), g16);
   corvane::tools::write_png(path("rgb.png"), rgb);
   const std::string out = path("out.png"), files = path("grey.png") + " " + out;
-  const struct {
-    std::string args;
-    int status;
-    std::string says;
-  } table[] = {
+  const run_case table[] = {
       {"sobel --deriv dxy --depth 32f --border constant " + files, 0, "sobel dxy 32f constant"},
       {"sobel --mode dhvx " + files, 0, "DualHVX"},
       {"gaussian --ksize 7 " + files, 0, "SingleHVX"},
@@ -270,13 +274,7 @@ TEST_F(CliRun, FiltersTakeTheirOptionsAndFiles) {
       {"conv3x3 --mask 0,0,0,0,200,0,0,0,0 " + files, 2, "-128 to 127"},
       {"conv3x3 --mask 0,0,0,0,1,0,0,0,0 --shift 16 " + files, 2, "0 to 15"},
   };
-  for (const auto& t : table) {
-    SCOPED_TRACE("corvane run " + t.args);
-    std::ofstream(out) << "precious";
-    EXPECT_EQ(t.status, cli("run " + t.args)) << output_;
-    EXPECT_NE(std::string::npos, output_.find(t.says)) << output_;
-    EXPECT_EQ(t.status != 0, bytes("out.png") == "precious");
-  }
+  check_runs(table);
 }
 
 // A uniform image shows each filter's edges: the right edge, past which the CLI pads the
