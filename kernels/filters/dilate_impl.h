@@ -18,7 +18,7 @@ CORVANE_FLAT void dilate3x3(hvx::mode_c<M>&, gen_in& _input, gen_out& _output) {
   const int rows = input.rows(), cols = input.cols();
   const int vectors = cols > lanes ? (cols + lanes - 1) / lanes : 1;
   const size_t stride = input.stride_vectors();
-  for (int y = 1; y < rows - 1; ++y) {
+  for (int y = 1; y + 1 < rows; ++y) {
     const vi32* const row = input.begin() + static_cast<size_t>(y) * stride;
     auto vertical = [&](int j) { return hvx::vmax(hvx::vmax(row[j - stride], row[j]), row[j + stride]); };
     vi32* const dst = output.begin() + static_cast<size_t>(y) * output.stride_vectors();

@@ -75,7 +75,7 @@ template <int K> CORVANE_FLAT void filter_rows(gen_in& _input, gen_out& _output)
   const int rows = input.rows(), vectors = static_cast<int>(row_vectors(input));
   const size_t in_stride = input.stride_vectors(), out_stride = output.stride_vectors();
   const wvi16 zero = vcombine(vzero<vi16>(), vzero<vi16>());
-  for (int y = r; y < rows - r; ++y) {
+  for (int y = r; y + r < rows; ++y) {  // y + r: rows may be any int
     const vec* window[K];
     for (int t = 0; t < K; ++t) window[t] = input.begin() + static_cast<size_t>(y - r + t) * in_stride;
     vec* const dst = output.begin() + static_cast<size_t>(y) * out_stride;

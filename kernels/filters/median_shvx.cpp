@@ -51,11 +51,11 @@ CORVANE_FLAT void median_row(const uint8_t* const (&rows)[3], int vectors, const
 
 template <hvx::mode_enum Mode, int Isa>
 AEEResult median_blur_3x3<Mode, Isa>::run(hvx::for_mode<Mode>, gen_in& src, gen_out& dst) {
-  const int rows = src.rows(), vectors = src.cols() > 0 ? (src.cols() + N - 1) / N : 0;
+  const int rows = src.rows(), vectors = src.cols() > 0 ? static_cast<int>(hvx::div_up(src.cols(), N)) : 0;
   const size_t stride = static_cast<size_t>(src.stride_bytes());
   const uint8_t* const in = src.buffer->mem;
   const uint8_t* const end = in + src.buffer->memLen;
-  for (int y = 1; y < rows - 1 && vectors > 0; ++y) {
+  for (int y = 1; y + 1 < rows && vectors > 0; ++y) {  // y + 1: rows may be any int
     const uint8_t* const row = in + y * stride;
     const uint8_t* const window[3] = {row - stride, row, row + stride};
     median_row(window, vectors, end, reinterpret_cast<vu8*>(dst.buffer->mem + y * stride));

@@ -95,7 +95,7 @@ CORVANE_FLAT void sobel3x3(hvx::mode_c<M>&, gen_in& _input, gen_out& _dx, gen_ou
   out<vec> dx(_dx), dy(_dy);
   const int rows = input.rows(), vectors = input.cols() > 0 ? (input.cols() + N - 1) / N : 0;
   const size_t stride = input.stride_vectors();
-  for (int y = 1; y < rows - 1; ++y) {
+  for (int y = 1; y + 1 < rows; ++y) {
     const vec* const row = input.begin() + static_cast<size_t>(y) * stride;
     const vec* const window[3] = {row - stride, row, row + stride};
     vec* const x_out = dx.begin() + static_cast<size_t>(y) * dx.stride_vectors();
