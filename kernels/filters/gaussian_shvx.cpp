@@ -112,6 +112,7 @@ CORVANE_FLAT void s16_to_float(vec* row, size_t vectors) {
 void widen_rows(const in<vec>& input, out<vec>& output) {
   const size_t width = output.stride_vectors(), in_width = input.stride_vectors();
   const int depth = output.depth();
+  if (width == 0) return;  // rows of no bytes, however many
   for (int y = 0; y < output.rows(); ++y) {
     vec* const row = output.begin() + static_cast<size_t>(y) * width;
     if (depth == 3) {

@@ -1,6 +1,7 @@
 // What the raw-pointer row jobs (the Sobel jobs, the 3x3 convolution) ask of their
 // arguments before anything runs: both pointers set; pointers, strides and the width
-// multiples of 128, so that every row access is an aligned whole vector; at least three
+// multiples of 128, so that every row access is an aligned whole vector; a width of at
+// least one vector, so that no stride of 0 repeats a row any number of times; at least three
 // rows; a width no wider than either stride; and buffers that hold every input row and
 // every output row the job writes.
 #ifndef CORVANE_KERNELS_FILTERS_ROW_JOB_H
@@ -34,7 +35,7 @@ inline bool row_job_fits(const row_job_shape& s) {
     return false;
   const corvane_mbuf in = flat_buffer(s.src, s.src_bytes), out = flat_buffer(s.dst, s.dst_bytes);
   return reach()
-      .refuse_if(s.width < 0 || s.src_stride < s.width || s.dst_stride < s.width)
+      .refuse_if(s.width <= 0 || s.src_stride < s.width || s.dst_stride < s.width)
       .rows(&in, s.height, s.src_stride, s.width)
       .rows(&out, s.dst_rows, s.dst_pitch, s.dst_row_bytes)
       .fits();
