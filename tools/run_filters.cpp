@@ -223,7 +223,8 @@ job conv3x3_job(const options& o) {
   return filter_job(
       "conv3x3a328u shift " + std::to_string(o.shift), png, o.files[1],
       [in, out, mask, shift = o.shift] { return client::conv3x3a328u(*in, mask, shift, *out); },
-      // Column 0 has no defined value: 0 in the file.
+      // Column 0 (whose left neighbour the method reads as 0) is shown 0, like the first and
+      // last rows, which the method does not filter.
       [out, cols = png.cols(), rows = png.rows()] {
         Image image = cropped(*out, cols, rows);
         for (int y = 0; y < rows; ++y) image.row(y)[0] = 0;

@@ -10,7 +10,7 @@ extern "C" {
 CORVANE_API AEEResult corvane_conv3x3a328u(const uint8_t* inp, int inpLen, int32_t stride_i, int32_t width,
                                            int32_t height, const uint8_t* mask, int maskLen, int32_t shift,
                                            uint8_t* outp, int outpLen, int32_t stride_o) {
-  if (!hvx::row_job_fits({inp, inpLen, stride_i, width, height, outp, outpLen, stride_o, stride_o,
+  if (!hvx::row_job_fits({inp, inpLen, stride_i, width, height, outp, outpLen, stride_o,
                           int64_t(height) - 1, width}) ||
       mask == nullptr || maskLen < 12)
     return hvx::RESULT_BAD_POINTER;

@@ -17,7 +17,6 @@ namespace {
 constexpr mode_enum M = DualHVX;
 constexpr int N = static_cast<int>(mode_vector_bytes<M>);
 typedef gen_vec<M> vec;
-typedef vu8_t<M> vu8;
 typedef vi16_t<M> vi16;
 typedef vi32_t<M> vi32;
 typedef wvi16_t<M> wvi16;

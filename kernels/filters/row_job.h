@@ -21,9 +21,8 @@ struct row_job_shape {
   int32_t height;
   const void* dst;
   int64_t dst_bytes;
-  int64_t dst_pitch;        // [bytes]
-  int64_t dst_stride;       // as given, for the multiple-of-128 test
-  int64_t dst_rows;         // from the buffer's first row through the last row written
+  int64_t dst_pitch;      // [bytes]
+  int64_t dst_rows;       // from the buffer's first row through the last row written
   int64_t dst_row_bytes;
 };
 
@@ -31,11 +30,11 @@ inline bool row_job_fits(const row_job_shape& s) {
   auto multiple = [](int64_t x) { return x % 128 == 0; };
   if (s.src == nullptr || s.dst == nullptr) return false;
   if (!multiple(reinterpret_cast<uintptr_t>(s.src)) || !multiple(reinterpret_cast<uintptr_t>(s.dst)) ||
-      !multiple(s.src_stride) || !multiple(s.width) || !multiple(s.dst_stride) || s.height <= 2)
+      !multiple(s.src_stride) || !multiple(s.width) || !multiple(s.dst_pitch) || s.height <= 2)
     return false;
   const corvane_mbuf in = flat_buffer(s.src, s.src_bytes), out = flat_buffer(s.dst, s.dst_bytes);
   return reach()
-      .refuse_if(s.width <= 0 || s.src_stride < s.width || s.dst_stride < s.width)
+      .refuse_if(s.width <= 0 || s.src_stride < s.width || s.dst_pitch < s.dst_row_bytes)
       .rows(&in, s.height, s.src_stride, s.width)
       .rows(&out, s.dst_rows, s.dst_pitch, s.dst_row_bytes)
       .fits();

@@ -15,7 +15,7 @@ AEEResult sobel_job(output_type type, const uint8_t* inp, int inpLen, int32_t st
                     void* outp, int64_t out_bytes, uint32_t sobelmode, uint32_t bordermode) {
   const int64_t pitch = int64_t(stride) * (1 << type);  // [bytes]
   const int64_t rows = type == hvx::sobel::u8_out ? int64_t(height) - 1 : height;
-  if (!hvx::row_job_fits({inp, inpLen, stride, width, height, outp, out_bytes, pitch, stride, rows,
+  if (!hvx::row_job_fits({inp, inpLen, stride, width, height, outp, out_bytes, pitch, rows,
                           int64_t(width) * (1 << type)}))
     return hvx::RESULT_BAD_POINTER;
   if (sobelmode > 2 || (type != hvx::sobel::u8_out && bordermode != 0 && bordermode != 1 && bordermode != 4))

@@ -6,6 +6,7 @@
 #ifndef CORVANE_KERNELS_FILTERS_SOBEL_IMPL_H
 #define CORVANE_KERNELS_FILTERS_SOBEL_IMPL_H
 
+#include "core/reach.h"
 #include "core/vector/ops.h"
 #include "kernels/filters/pair_ops.h"
 #include "kernels/filters/sobel.h"
@@ -93,7 +94,7 @@ CORVANE_FLAT void sobel3x3(hvx::mode_c<M>&, gen_in& _input, gen_out& _dx, gen_ou
   constexpr int N = static_cast<int>(hvx::mode_vector_bytes<M>);
   in<vec> input(_input);
   out<vec> dx(_dx), dy(_dy);
-  const int rows = input.rows(), vectors = input.cols() > 0 ? (input.cols() + N - 1) / N : 0;
+  const int rows = input.rows(), vectors = input.cols() > 0 ? static_cast<int>(hvx::div_up(input.cols(), N)) : 0;
   const size_t stride = input.stride_vectors();
   for (int y = 1; y + 1 < rows; ++y) {
     const vec* const row = input.begin() + static_cast<size_t>(y) * stride;
