@@ -54,11 +54,19 @@ template <class Job> void direct_worker(void* data) {
   job.done();
 }
 
-// Splits `rows` rows over the workers of a 128-byte job and waits for them: 13 when the
-// platform recommends against compute or a worker could not lock, 1 without a unit,
-// else 0.
-template <class Job> AEEResult run_direct_job(Job& job, int rows) {
-  if (!loop_detail::compute_recommended()) return RESULT_NOT_NOW;
+// What a job's entry answers besides its shares: whether it asks the platform's compute
+// recommendation first (13 when it is "not OK"), and whether a worker that could not lock
+// makes the answer 13; otherwise that worker's rows stay unwritten and the answer is 0.
+struct direct_rules {
+  bool asks_compute;
+  bool reports_bail;
+};
+constexpr direct_rules kCheckedJob{true, true};
+
+// Splits `rows` rows over the workers of a 128-byte job and waits for them: 13 as the
+// rules say, 1 without a unit, else 0.
+template <class Job> AEEResult run_direct_job(Job& job, int rows, direct_rules rules = kCheckedJob) {
+  if (rules.asks_compute && !loop_detail::compute_recommended()) return RESULT_NOT_NOW;
   prepared_job units(DualHVX);
   if (!units.has_units() || units.threads() == 0) return RESULT_NOT_READY;
   job.workers = units.threads();
@@ -68,7 +76,7 @@ template <class Job> AEEResult run_direct_job(Job& job, int rows) {
   job.status = 0;
   dspCV_worker_pool_synctoken_init(&job.token, job.workers);
   loop_detail::submit_and_wait(job.token, &direct_worker<Job>, &job, job.workers);
-  return job.read_status() != 0 ? RESULT_NOT_NOW : RESULT_OK;
+  return rules.reports_bail && job.read_status() != 0 ? RESULT_NOT_NOW : RESULT_OK;
 }
 
 }  // namespace hvx
