@@ -2,7 +2,11 @@
 // bytes, the two-channel split against cv::split, and the element-wise arithmetic,
 // convertScaleAbs, thresh and hvx_sum against OpenCV's operations of the same types.
 // The flat-buffer methods take the frame's bytes as one buffer (no row padding at 1920
-// columns).
+// columns). Then the colour conversions against cv::cvtColor, the integral image against
+// cv::integral, the histograms against cv::calcHist, and the lens shading correction
+// against cv::multiply of the frame by a gain image (a gain a pixel, scale 1/2048: the same
+// product without the correction's curve).
+#include <functional>
 #include <memory>
 
 #include <opencv2/core.hpp>
@@ -65,6 +69,68 @@ struct sum_images {
   alignas(64) int32_t lanes[16] = {};
   cv::Scalar totals;
   sum_images() { src.fill_random(9); }
+};
+
+// A three-channel u8 frame (5760 bytes a row: whole vectors and whole pixels) and outputs
+// of three channels (YUV) and one (grey); 1920 pixels a row are 15 output vectors in
+// DualHVX and 30 in SingleHVX, so the grey image needs no padding.
+struct colour_images {
+  Image src{kFrameCols, kFrameRows, 3, client::U8};
+  Image dst3{kFrameCols, kFrameRows, 3, client::U8};
+  Image grey{kFrameCols, kFrameRows, 1, client::U8};
+  colour_images() { src.fill_random(21); }
+};
+
+bench_case colour_case(const char* name, uint8_t code, int cv_code) {
+  const bool grey = code == client::RGB2GRAY;
+  return {name, method::cvtColor, tools::HVX, kFramePixels, kFramePixels * (grey ? 4 : 6), "cv::cvtColor", [=] {
+            auto img = std::make_shared<colour_images>();
+            Image* out = grey ? &img->grey : &img->dst3;
+            return calls{[img, out, code] { return client::cvtColor(img->src, *out, code); },
+                         [img, cv_code, src = as_mat(img->src), dst = as_mat(*out)]() mutable {
+                           cv::cvtColor(src, dst, cv_code);
+                         }};
+          }};
+}
+
+struct integral_images {
+  Image src{kFrameCols, kFrameRows, 1, client::U8};
+  Image dst{kFrameCols, kFrameRows, 1, client::I32};
+  cv::Mat cv_dst{kFrameRows + 1, kFrameCols + 1, CV_32S};  // OpenCV's has a zero row and column
+  integral_images() { src.fill_random(22); }
+};
+
+// The 8-bit histogram adds into its table, never cleared here (a bin gains about 8100 a
+// call, some 250000 calls from overflowing); OpenCV makes a fresh one each time. The ranged one
+// counts u16 pixels into 8 bins, the last bound 65535, against 8 uniform bins over 0..65535.
+struct hist_images {
+  Image src8{kFrameCols, kFrameRows, 1, client::U8};
+  Image src16{kFrameCols, kFrameRows, 1, client::U16};
+  Image lanes{8 * 32, 1, 1, client::I32};  // 8 vectors of up to 128 bytes
+  client::hist256 table;
+  cv::Mat cv_hist;
+  hist_images() {
+    src8.fill_random(23);
+    src16.fill_random(24);
+    lanes.fill(0);
+  }
+};
+
+// LSC's gain planes: rows / 2 + 1 rows of 960 u16 gains for each column parity, near 1.0.
+struct lsc_images {
+  Image src{kFrameCols, kFrameRows, 1, client::U8};
+  Image dst{kFrameCols, kFrameRows, 1, client::U8};
+  Image gain024{kFrameCols / 2, kFrameRows / 2 + 1, 1, client::U16};
+  Image gain135{kFrameCols / 2, kFrameRows / 2 + 1, 1, client::U16};
+  Image gains{kFrameCols, kFrameRows, 1, client::U16};  // OpenCV's: one gain a pixel
+  Image cv_dst{kFrameCols, kFrameRows, 1, client::U8};
+  lsc_images() {
+    src.fill_random(25);
+    for (Image* g : {&gain024, &gain135, &gains})
+      for (int y = 0; y < g->rows(); ++y)
+        for (int x = 0; x < g->cols(); ++x)
+          reinterpret_cast<uint16_t*>(g->row(y))[x] = uint16_t(1800 + (x * 7 + y * 13) % 600);
+  }
 };
 
 CORVANE_BENCH_CASES(pixelwise_cases) {
@@ -148,6 +214,55 @@ CORVANE_BENCH_CASES(pixelwise_cases) {
                         return client::hvx_sum(img->src.data(), int(img->src.byte_size()), U8, 3, img->lanes);
                       },
                       [img, src = as_mat(img->src)] { img->totals = cv::sum(src); }};
+       }},
+      colour_case("cvtColor/1920x1080_rgb2yuv", client::RGB2YUV, cv::COLOR_RGB2YUV),
+      colour_case("cvtColor/1920x1080_yuv2rgb", client::YUV2RGB, cv::COLOR_YUV2RGB),
+      colour_case("cvtColor/1920x1080_rgb2gray", client::RGB2GRAY, cv::COLOR_RGB2GRAY),
+      {"integrate/1920x1080_u8_u32", method::integrate, tools::ALL, kFramePixels, 5 * frame_bytes,
+       "cv::integral CV_32S",
+       [] {
+         auto img = std::make_shared<integral_images>();
+         return calls{[img] { return client::integrate(img->src, img->dst); },
+                      [img, src = as_mat(img->src)]() mutable { cv::integral(src, img->cv_dst, CV_32S); }};
+       }},
+      {"calcHist_8u1d/1920x1080_u8", method::calcHist_8u1d, tools::ALL, kFramePixels, frame_bytes + 1024,
+       "cv::calcHist 256 bins",
+       [] {
+         auto img = std::make_shared<hist_images>();
+         return calls{[img] { return client::calcHist_8u1d(img->src8, 0, img->table); },
+                      [img, src = as_mat(img->src8)]() mutable {
+                        const int channels[] = {0}, sizes[] = {256};
+                        const float range[] = {0, 256};
+                        const float* ranges[] = {range};
+                        cv::calcHist(&src, 1, channels, cv::Mat(), img->cv_hist, 1, sizes, ranges);
+                      }};
+       }},
+      {"calcHist/1920x1080_u16_8_bins", method::calcHist, tools::ALL, kFramePixels, 2 * frame_bytes + 1024,
+       "cv::calcHist 8 bins",
+       [] {
+         auto img = std::make_shared<hist_images>();
+         static constexpr uint16_t kBounds[8] = {8192, 16384, 24576, 32768, 40960, 49152, 57344, 65535};
+         return calls{[img] { return client::calcHist(img->src16, 0, kBounds, 8, img->lanes); },
+                      [img, src = as_mat(img->src16)]() mutable {
+                        const int channels[] = {0}, sizes[] = {8};
+                        const float range[] = {0, 65536};
+                        const float* ranges[] = {range};
+                        cv::calcHist(&src, 1, channels, cv::Mat(), img->cv_hist, 1, sizes, ranges);
+                      }};
+       }},
+      {"LSC/1920x1080_u8", method::LSC, tools::ALL, kFramePixels, 3 * frame_bytes, "cv::multiply by u16 gains",
+       [] {
+         auto img = std::make_shared<lsc_images>();
+         std::function<void()> reference = [img, src = as_mat(img->src), gains = as_mat(img->gains),
+                                            dst = as_mat(img->cv_dst)]() mutable {
+           cv::multiply(src, gains, dst, 1.0 / 2048, CV_8U);
+         };
+         try {
+           reference();
+         } catch (const cv::Exception&) {
+           reference = nullptr;  // this OpenCV does not multiply mixed types
+         }
+         return calls{[img] { return client::LSC(img->src, img->gain024, img->gain135, img->dst); }, reference};
        }},
   };
 }

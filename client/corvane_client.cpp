@@ -1,5 +1,6 @@
 #include "client/corvane_client.h"
 
+#include <algorithm>
 #include <cstring>
 #include <vector>
 
@@ -62,6 +63,77 @@ AEEResult convertScaleAbs(const Image& in, Image& out, double alpha, double beta
 
 AEEResult thresh(const Image& src, Image& dst, int32_t threshold, int32_t max, uint32_t op) {
   return call<method::thresh>(&src.descriptor(), &src.mbuf(), &dst.descriptor(), &dst.mbuf(), threshold, max, op);
+}
+
+AEEResult cvtColor(const Image& in, Image& out, uint8_t code) {
+  return call<method::cvtColor>(&in.descriptor(), &in.mbuf(), code, &out.descriptor(), &out.mbuf());
+}
+
+int gray_stride(const Image& in) {
+  const int64_t bytes = int64_t(in.cols()) * in.channels() * element_size(in.depth());
+  int64_t widest = 128;
+  for (int64_t vector : {64, 128}) {
+    const int64_t groups = ((bytes + vector - 1) / vector + 2) / 3;  // one output vector per 3 read
+    widest = std::max(widest, groups * vector);
+  }
+  return int((widest + 127) / 128 * 128);
+}
+
+AEEResult LSC(const Image& src, const Image& gain024, const Image& gain135, Image& dst) {
+  return call<method::LSC>(src.data(), int(src.byte_size()), dst.data(), int(dst.byte_size()), uint32_t(src.cols()),
+                           uint32_t(src.rows()), gain024.data(), int(gain024.byte_size()), gain135.data(),
+                           int(gain135.byte_size()));
+}
+
+AEEResult integrate(const Image& in, Image& out) {
+  return call<method::integrate>(in.data(), int(in.byte_size()), in.stride(), in.cols(), in.rows(),
+                                 reinterpret_cast<uint32_t*>(out.data()), int(out.byte_size() / 4), out.stride());
+}
+
+AEEResult clearHist(const corvane_mbufd& desc, int32_t* table, int table_bytes) {
+  corvane_mbuf buf{reinterpret_cast<unsigned char*>(table), table_bytes};
+  return call<method::clearHist>(&desc, &buf);
+}
+
+AEEResult clearHist(hist256& table) {
+  // (4 * 240) / 64 + 1 = 16 vectors: the 1024 bytes of the bins and no more.
+  const corvane_mbufd one_run{240, 1, 1, 1, I32, 0, 0, 0, 0};
+  return clearHist(one_run, table.bins, int(sizeof table.bins));
+}
+
+AEEResult calcHist_8u1d(const Image& in, int32_t channel, hist256& table) {
+  // The method reads neither the table's descriptor nor the ranges.
+  const corvane_mbufd bins{int(sizeof table.bins), 256, 1, 1, I32, 0, 0, 0, 0};
+  corvane_mbuf buf{reinterpret_cast<unsigned char*>(table.bins), int(sizeof table.bins)};
+  return call<method::calcHist_8u1d>(&in.descriptor(), &in.mbuf(), &bins, &buf, channel, nullptr, 0);
+}
+
+namespace {
+AEEResult ranged_hist(const Image& in, uint8_t channel, const void* bounds, int bounds_bytes, Image& lanes) {
+  return call<method::calcHist>(&in.descriptor(), &in.mbuf(), &lanes.descriptor(), &lanes.mbuf(), &channel, 1,
+                                static_cast<const uint8_t*>(bounds), bounds_bytes);
+}
+}  // namespace
+
+AEEResult calcHist(const Image& in, uint8_t channel, const uint16_t* bounds, int hist_size, Image& lanes) {
+  return ranged_hist(in, channel, bounds, hist_size * 2, lanes);
+}
+
+AEEResult calcHist(const Image& in, uint8_t channel, const float* bounds, int hist_size, Image& lanes) {
+  return ranged_hist(in, channel, bounds, hist_size * 4, lanes);
+}
+
+std::vector<int64_t> hist_bins(const Image& lanes, int hist_size, int vector_bytes) {
+  std::vector<int64_t> counts(size_t(std::max(hist_size, 0)), 0);
+  if (vector_bytes <= 0) return counts;
+  const size_t held = std::min(counts.size(), lanes.byte_size() / size_t(vector_bytes));
+  for (size_t k = 0; k < held; ++k)
+    for (int lane = 0; lane < vector_bytes / 4; ++lane) {
+      int32_t c;
+      std::memcpy(&c, lanes.data() + k * size_t(vector_bytes) + 4 * size_t(lane), 4);
+      counts[k] += c;
+    }
+  return counts;
 }
 
 AEEResult sobel8u(const Image& in, Image& out, uint32_t sobelmode) {

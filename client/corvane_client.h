@@ -11,6 +11,7 @@
 #include <stdint.h>
 
 #include <string>
+#include <vector>
 
 #include "client/call.h"
 #include "client/image.h"
@@ -64,6 +65,77 @@ AEEResult convertScaleAbs(const Image& in, Image& out, double alpha, double beta
 // inverted, 2 truncate, 3 to zero, 4 to zero inverted. Strides are multiples of 128 and
 // both must hold each row's whole 128-byte vectors.
 AEEResult thresh(const Image& src, Image& dst, int32_t threshold, int32_t max, uint32_t op);
+
+// The colour conversion codes cvtColor serves (the values of ColorConversionCodes).
+enum color_code : uint8_t { BGR2GRAY = 6, RGB2GRAY = 7, RGB2YUV = 83, YUV2RGB = 85 };
+
+// Converts the three interleaved channels of `in` into `out` by `code`:
+// - RGB2YUV and YUV2RGB (u8, every mode): packed Y, U, V with U and V offset by 128. The
+//   vector modes convert every byte of each row's stride, padding included, into as many
+//   bytes of out's row; Scalar converts floor(in.stride() / 3) pixels a row. Either way
+//   out's stride must hold in.stride() bytes.
+// - BGR2GRAY and RGB2GRAY (vector modes only; u8, or u16 when in.depth() is U16): one grey
+//   element a pixel. A row is read as nvec = ceil(cols * channels / E) input vectors (E elements a
+//   vector) and written as ceil(nvec / 3) whole output vectors, which out's stride must
+//   hold (gray_stride).
+// Scalar answers 1 for the grey codes and any other code, the vector modes 0 for other
+// codes, with nothing written. The vector modes want data and strides that are multiples
+// of the vector (64 bytes with one unit, 128 with two or more; an Image's are).
+AEEResult cvtColor(const Image& in, Image& out, uint8_t code);
+// The narrowest stride, a multiple of 128, that holds a grey row of `in` in both vector modes.
+int gray_stride(const Image& in);
+
+// Lens shading correction of a u8 image (DualHVX only; 1 with fewer than two units): each
+// pixel linearised by a table, times its gain (u16, 2048 = 1.0), clipped, and brought back
+// to 8 bits by a polynomial. Rows are dense: src's and dst's strides are their cols, a
+// multiple of 128 (an Image of such cols has it). The gain planes hold u16 gains in rows of
+// src.cols() bytes: column c of image row y takes entry c / 2 of gain024's row (c even) or
+// gain135's row (c odd), gain row y for y < rows / 2 and 2 * (rows / 2) - y after that, so
+// each plane has rows / 2 + 1 rows of src.cols() / 2 gains. Answers 13 when the platform
+// advises against computing.
+AEEResult LSC(const Image& src, const Image& gain024, const Image& gain135, Image& dst);
+
+// The integral image of a one-channel u8 image (DualHVX only; 1 with fewer than two units):
+// out(x, y) = the sum of in over columns <= x and rows <= y, modulo 2^32, into an I32 image
+// of in's size (read the elements as uint32). Data, strides and in.cols() are multiples of
+// 128, rows at least 3, and out's stride holds 4 * in.cols() bytes.
+AEEResult integrate(const Image& in, Image& out);
+
+// The 256 bins of calcHist_8u1d, aligned as the method wants.
+struct hist256 {
+  alignas(128) int32_t bins[256] = {};
+};
+
+// Zeroes desc.cols runs of a table of int32 bins (SingleHVX; 1 without a unit): run i starts
+// at bin i * desc.stride and is (4 * desc.stride) / 64 + 1 whole 64-byte vectors long, so
+// the buffer must hold the last run's whole vectors: one 256-bin table cleared as
+// cols 1, stride 256 needs 1088 bytes. `table` 64-byte aligned, 4 * desc.stride a multiple of 64.
+AEEResult clearHist(const corvane_mbufd& desc, int32_t* table, int table_bytes);
+// Zeroes the 256 bins (one run of 16 vectors: the descriptor's stride is 240 bins).
+AEEResult clearHist(hist256& table);
+
+// Counts the byte values of channel `channel` (0, or any other value: 1) of a u8 image of
+// 1 or 2 channels and ADDS them to `table`'s bins (SingleHVX; 1 without a unit): the table
+// keeps what it held, so clear it for a fresh count. Each row is read in whole 64-byte
+// vectors, ceil(cols * channels / 64) of them, which the stride must hold (an Image's
+// does); cols * channels is at most 8192 and channels 1 or 2, else 4.
+AEEResult calcHist_8u1d(const Image& in, int32_t channel, hist256& table);
+
+// Counts channel `channel` of a u16 or f32 image of 1 to 3 interleaved channels into
+// `hist_size` bins, bin k holding the pixels below bounds[k] and not below bounds[k - 1]
+// (bounds ascending, of the pixels' type: uint16_t for U16, float for F32; a float pixel
+// equal to a bound that is not positive counts below it with 1 or 2 channels), and ADDS
+// the counts to `lanes` (SingleHVX or DualHVX; 1 without a unit). Pixels at or above the
+// last bound count nowhere. `lanes` holds one vector of int32 lane counters a bin, 64
+// bytes with one unit and 128 with two or more (an image of hist_size * 32 I32 elements
+// holds either); bin k's count is the sum of vector k's lanes (hist_bins). The pixels are
+// read as one dense run from in's first byte, whole vectors at a time: in's stride must be
+// its row's bytes, a multiple of 128.
+AEEResult calcHist(const Image& in, uint8_t channel, const uint16_t* bounds, int hist_size, Image& lanes);
+AEEResult calcHist(const Image& in, uint8_t channel, const float* bounds, int hist_size, Image& lanes);
+// The counts of calcHist's table: the sum of each of the first `hist_size` vectors of
+// `vector_bytes` (64 for a SingleHVX call, 128 for a DualHVX one).
+std::vector<int64_t> hist_bins(const Image& lanes, int hist_size, int vector_bytes);
 
 // Sobel derivatives of a one-channel u8 image (DualHVX only): sobelmode 0 dx, 1 dy, 2 dxy.
 // The input's data, stride and cols are multiples of 128 and rows at least 3. The output's

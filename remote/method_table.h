@@ -142,7 +142,7 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
   M(30, ppht_lines, later, (rout(seq_u8, "data"), in(u32, "numberOfPoints"), in(u32, "maskWidth"),                \
       in(u32, "maskHeight"), in(u32, "numberOfR"), in(u32, "numberOfTheta"), in(seq_u8, "sincos_lut"),            \
       in(i32, "threshold"), in(i32, "minLineLength"), in(i32, "maxGap"), rout(u32, "numberOfLines")))             \
-  M(31, cvtColor, later, (in(mbufd, "_inputDesc"), in(imbuf, "_input"), in(u8, "code"),                           \
+  M(31, cvtColor, built, (in(mbufd, "_inputDesc"), in(imbuf, "_input"), in(u8, "code"),                           \
       in(mbufd, "_outputDesc"), rout(ombuf, "_output")))                                                          \
   M(32, cornerMinEigenVal_v2, later, (in(mbufd, "in_desc"), in(imbuf, "Dx"), in(imbuf, "Dy"),                     \
       in(mbufd, "out_desc"), rout(ombuf, "corner_response"), in(i32, "blockSize"), in(i32, "borderType")))        \
@@ -159,7 +159,7 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
       rout(ombuf, "_eigenValueDilate"), in(mbufd, "_tempCornersDesc"), rout(ombuf, "_tempCorners"),               \
       in(mbufd, "_gridDesc"), rout(ombuf, "_grid"), in(mbufd, "_cornersDesc"), rout(ombuf, "_corners"),           \
       rout(i32, "numberOfCorners")))                                                                              \
-  M(37, LSC, later, (in(seq_u8, "src"), rout(seq_u8, "dst"), in(u32, "width"), in(u32, "height"),                 \
+  M(37, LSC, built, (in(seq_u8, "src"), rout(seq_u8, "dst"), in(u32, "width"), in(u32, "height"),                 \
       in(seq_u8, "gain024"), in(seq_u8, "gain135")))                                                              \
   M(38, morphOp, built, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "dstDesc"), rout(ombuf, "dst"),        \
       in(i32, "kernel"), in(i32, "iterations"), in(i32, "kernelShape"), in(i32, "borderType"),                    \
@@ -174,14 +174,14 @@ template <class... P> constexpr param_list params(P... p) { return param_list{{p
   M(42, pyrDown, later, (in(mbufd, "src_desc"), in(imbuf, "src"), in(mbufd, "dst_desc"), rout(ombuf, "dst")))     \
   M(43, pyrUp, later, (in(mbufd, "src_desc"), in(imbuf, "src"), in(mbufd, "buf_desc"), rout(ombuf, "buf"),        \
       in(mbufd, "dst_desc"), rout(ombuf, "dst")))                                                                 \
-  M(44, clearHist, later, (in(mbufd, "input_desc"), rout(ombuf, "input")))                                        \
-  M(45, calcHist_8u1d, later, (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "output_desc"),             \
+  M(44, clearHist, built, (in(mbufd, "input_desc"), rout(ombuf, "input")))                                        \
+  M(45, calcHist_8u1d, built, (in(mbufd, "input_desc"), in(imbuf, "input"), in(mbufd, "output_desc"),             \
       rout(ombuf, "output"), in(i32, "channel"), in(seq_u8, "ranges")))                                           \
-  M(46, calcHist, later, (in(mbufd, "in_desc"), in(imbuf, "input"), in(mbufd, "out_desc"),                        \
+  M(46, calcHist, built, (in(mbufd, "in_desc"), in(imbuf, "input"), in(mbufd, "out_desc"),                        \
       rout(ombuf, "output"), in(seq_u8, "channels"), in(seq_u8, "ranges")))                                       \
   M(47, thresh, built, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "dstDesc"), rout(ombuf, "dst"),         \
       in(i32, "threshold"), in(i32, "max"), in(u32, "op")))                                                       \
-  M(48, integrate, later, (in(seq_u8, "inp"), in(i32, "srcStride"), in(i32, "srcWidth"), in(i32, "srcHeight"),    \
+  M(48, integrate, built, (in(seq_u8, "inp"), in(i32, "srcStride"), in(i32, "srcWidth"), in(i32, "srcHeight"),    \
       rout(seq_u32, "outp"), in(i32, "dstStride")))                                                               \
   M(49, filter2D, built, (in(mbufd, "srcDesc"), in(imbuf, "src"), in(mbufd, "dstDesc"), rout(ombuf, "dst"),       \
       in(seq_i16, "kernel"), in(i32, "delta")))                                                                   \

@@ -27,8 +27,6 @@ AEEResult corvane_resize(const corvane_mbufd*, const corvane_mbuf*, const corvan
     corvane_mbuf*) { return kNotBuilt; }
 AEEResult corvane_ppht_lines(uint8_t*, int, uint32_t, uint32_t, uint32_t, uint32_t, uint32_t, const uint8_t*, int,
     int32_t, int32_t, int32_t, uint32_t*) { return kNotBuilt; }
-AEEResult corvane_cvtColor(const corvane_mbufd*, const corvane_mbuf*, uint8_t, const corvane_mbufd*,
-    corvane_mbuf*) { return kNotBuilt; }
 AEEResult corvane_cornerMinEigenVal_v2(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbuf*,
     const corvane_mbufd*, corvane_mbuf*, int32_t, int32_t) { return kNotBuilt; }
 AEEResult corvane_cornerMinEigenValFP(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbuf*,
@@ -39,19 +37,10 @@ AEEResult corvane_goodFeaturesToTrack(const corvane_mbufd*, const corvane_mbuf*,
     const corvane_mbuf*, float, float, int32_t, uint8_t, float, int32_t, const corvane_mbufd*, corvane_mbuf*,
     corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
     const corvane_mbufd*, corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*, int32_t*) { return kNotBuilt; }
-AEEResult corvane_LSC(const uint8_t*, int, uint8_t*, int, uint32_t, uint32_t, const uint8_t*, int, const uint8_t*,
-    int) { return kNotBuilt; }
 AEEResult corvane_pyrDown(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*,
     corvane_mbuf*) { return kNotBuilt; }
 AEEResult corvane_pyrUp(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
     const corvane_mbufd*, corvane_mbuf*) { return kNotBuilt; }
-AEEResult corvane_clearHist(const corvane_mbufd*, corvane_mbuf*) { return kNotBuilt; }
-AEEResult corvane_calcHist_8u1d(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
-    int32_t, const uint8_t*, int) { return kNotBuilt; }
-AEEResult corvane_calcHist(const corvane_mbufd*, const corvane_mbuf*, const corvane_mbufd*, corvane_mbuf*,
-    const uint8_t*, int, const uint8_t*, int) { return kNotBuilt; }
-AEEResult corvane_integrate(const uint8_t*, int, int32_t, int32_t, int32_t, uint32_t*, int,
-    int32_t) { return kNotBuilt; }
 AEEResult corvane_trackLK(const uint8_t*, int, const uint8_t*, int, uint32_t, uint32_t, float*, int, float*, int,
     float*, int, int32_t*, int, int32_t, uint32_t, uint32_t, int32_t, int32_t, float, int32_t,
     int32_t) { return kNotBuilt; }

@@ -72,7 +72,7 @@ constexpr method_modes kMethodModes[] = {
     modes_row::k(modes_row::m::remap, SCALAR),
     modes_row::k(modes_row::m::resize, HVX),  // cubic interpolation: SingleHVX only
     modes_row::k(modes_row::m::ppht_lines, SCALAR),
-    modes_row::k(modes_row::m::cvtColor, ALL),
+    modes_row::k(modes_row::m::cvtColor, ALL),  // the grey codes: SingleHVX and DualHVX only
     modes_row::k(modes_row::m::cornerMinEigenVal_v2, SCALAR),
     modes_row::k(modes_row::m::cornerMinEigenValFP, HVX),
     modes_row::k(modes_row::m::cornerHarris, ALL),

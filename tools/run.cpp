@@ -213,6 +213,14 @@ const option_row kOptions[] = {
        o.shift = parse_int(v, "--shift");
        if (o.shift < 0 || o.shift > 15) throw usage_error("--shift " + v + ": give 0 to 15");
      }},
+    {"--code", "cvtColor", true,
+     [](options& o, const std::string& v) { o.code = kColorCodeValues[pick(kColorCodes, v, "--code")]; }},
+    {"--channel", "hist", true,
+     [](options& o, const std::string& v) {
+       o.channel = parse_int(v, "--channel");
+       if (o.channel < 0 || o.channel > 3) throw usage_error("--channel " + v + ": give 0 to 3");
+     }},
+    {"--plot", "hist", true, [](options& o, const std::string& v) { o.plot = v; }},
 };
 
 job identity_job(const options& o) {
@@ -301,6 +309,8 @@ const cli_method kCliMethods[] = {
     {"median3x3", method::median3x3, "IN.png OUT.png", nullptr, median3x3_job},
     {"morph", method::morphOp, "IN.png OUT.png", "--op", morph_job},  // morphologyEx: the same modes
     {"conv3x3", method::conv3x3a328u, "IN.png OUT.png", "--mask", conv3x3_job},
+    {"cvtColor", method::cvtColor, "IN.png OUT.png", "--code", cvtcolor_job},
+    {"hist", method::calcHist_8u1d, "IN.png", nullptr, hist_job},  // clearHist: the same mode
 };
 
 bool listed(const char* methods, const std::string& name) {
@@ -421,6 +431,8 @@ void print_run_usage(FILE* out) {
       "       corvane run morph --op OP [--shape rect|cross] [--border constant|replicate] [--value V]\n"
       "                         IN.png OUT.png\n"
       "       corvane run conv3x3 --mask a,b,c,d,e,f,g,h,i [--shift N] IN.png OUT.png\n"
+      "       corvane run cvtColor --code rgb2yuv|yuv2rgb|bgr2gray|rgb2gray [--mode M] IN.png OUT.png\n"
+      "       corvane run hist [--channel N] [--plot CHART.png] IN.png\n"
       "  IN.png     8-bit or 16-bit PNG, grey, grey+alpha, RGB or RGBA (channels are filtered apart)\n"
       "  --mode     scalar, shvx or dhvx (default: CORVANE_MODE, else the best the method allows)\n"
       "  --ksize    odd sides 1 to 15, default 3x3; 5 means 5x5\n"
@@ -451,7 +463,16 @@ void print_run_usage(FILE* out) {
       "             to the sample's range); gradient, tophat and blackhat are subtracted on the host\n"
       "  conv3x3:   clamp(int16(sum of weight x pixel >> N), 0, 255) over 3x3 (a correlation, weights\n"
       "             -128 to 127, row after row, shift 0 to 15, default 0), 0 outside; the first and last\n"
-      "             rows and the first column stay 0\n");
+      "             rows and the first column stay 0\n"
+      "  cvtColor:  an 8-bit RGB PNG; rgb2yuv writes packed Y, U, V (U and V offset by 128) as the PNG's\n"
+      "             three channels and yuv2rgb reads them so. bgr2gray and rgb2gray (SingleHVX and DualHVX\n"
+      "             only) write a grey PNG, 16-bit from a 16-bit PNG; bgr2gray takes the file's first\n"
+      "             channel as blue\n"
+      "  hist:      prints the 256-bin histogram of one channel of an 8-bit PNG (default 0) and the\n"
+      "             pixel count, from clearHist and calcHist_8u1d (SingleHVX); --plot writes it as a\n"
+      "             256x100 grey bar chart, bars scaled to the fullest bin. A channel of an RGB(A) file\n"
+      "             is copied out first; rows wider than 8192 bytes are counted in strips of columns,\n"
+      "             which add into the one table\n");
 }
 
 int run_command(int argc, char** argv) {

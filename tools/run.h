@@ -20,7 +20,7 @@ int run_command(int argc, char** argv);
 
 void print_run_usage(FILE* out);
 
-// What run.cpp and run_pixelwise.cpp share.
+// What run.cpp and the files of the jobs share.
 namespace run_detail {
 
 struct usage_error : std::runtime_error {
@@ -55,6 +55,10 @@ struct options {
   int shape = 0;          // morph: 0 rectangle, 2 cross
   int8_t mask[9] = {};    // conv3x3, row after row
   int shift = 0;          // conv3x3
+  // cvtColor and hist
+  uint8_t code = 0;       // cvtColor: the ColorConversionCodes value
+  int channel = 0;        // hist: the channel counted
+  std::string plot;       // hist: the bar chart's PNG; empty: none
 };
 
 // One prepared call on images already read: `finish` runs after it answered 0, writes
@@ -75,6 +79,10 @@ inline constexpr const char* kSobelDepths[] = {"8u", "16s", "32f"};
 // The morphology operations by number (0 and 1 morphOp, 2 to 6 morphologyEx).
 inline constexpr const char* kMorphOps[] = {"erode", "dilate", "open", "close", "gradient", "tophat", "blackhat"};
 
+// cvtColor's codes as --code names them, and their values.
+inline constexpr const char* kColorCodes[] = {"rgb2yuv", "yuv2rgb", "bgr2gray", "rgb2gray"};
+inline constexpr uint8_t kColorCodeValues[] = {client::RGB2YUV, client::YUV2RGB, client::BGR2GRAY, client::RGB2GRAY};
+
 int parse_int(const std::string& text, const char* what);
 const char* type_name(int32_t depth);
 std::string shape_of(const client::Image& image);
@@ -86,6 +94,8 @@ job thresh_job(const options& o);
 job convert_job(const options& o);
 job arithm_job(const options& o);
 job sum_job(const options& o);
+job cvtcolor_job(const options& o);
+job hist_job(const options& o);
 job sobel_job(const options& o);
 job gaussian_job(const options& o);
 job median_job(const options& o);

@@ -1,13 +1,17 @@
 // `corvane run` for the pixel-wise methods: thresh, convertScaleAbs, the element-wise
-// arithmetic and hvx_sum. Each reads its PNG files into the buffers its method walks
-// and turns the method's output back into a PNG (or, for the sums, into lines of text).
+// arithmetic, hvx_sum, cvtColor and the 8-bit histogram. Each reads its PNG files into the
+// buffers its method walks and turns the method's output back into a PNG (or, for the
+// sums and the histogram, into lines of text).
 #include <algorithm>
 #include <cstdint>
 #include <cstdio>
 #include <cstring>
+#include <iterator>
 #include <memory>
+#include <numeric>
 #include <stdexcept>
 #include <string>
+#include <vector>
 
 #include "tools/png_io.h"
 #include "tools/run.h"
@@ -214,6 +218,92 @@ job sum_job(const options& o) {
     for (int c = 0; c < cn; ++c)
       lines += "channel " + std::to_string(c) + ": " + std::to_string(lane_total[c]) + " (uint32 of the lanes), " +
                std::to_string(host_total[c]) + " (host)\n";
+    return lines;
+  };
+  return j;
+}
+
+job cvtcolor_job(const options& o) {
+  const bool grey = o.code == client::BGR2GRAY || o.code == client::RGB2GRAY;
+  const char* name = kColorCodes[0];
+  for (size_t i = 0; i < std::size(kColorCodes); ++i)
+    if (kColorCodeValues[i] == o.code) name = kColorCodes[i];
+  if (grey && o.mode_given && o.m == Scalar)
+    throw usage_error(std::string("--code ") + name +
+                      " has no Scalar mode (the grey codes run in SingleHVX and DualHVX)");
+  // The PNG's own rows: a stride of whole 128-byte vectors, which both vector modes take.
+  auto in = std::make_shared<Image>(read_png(o.files[0]));
+  if (in->channels() != 3 || (in->depth() != client::U8 && !grey))
+    throw std::runtime_error(o.files[0] + ": cvtColor --code " + name + " takes an RGB PNG of " +
+                             (grey ? "8- or 16-bit" : "8-bit") + " samples");
+  // YUV writes each row's whole stride; grey whole output vectors, one per three read.
+  auto out = std::make_shared<Image>(
+      grey ? client::canary_image(in->cols(), in->rows(), 1, in->depth(), client::gray_stride(*in), 0)
+           : client::canary_image(in->cols(), in->rows(), 3, client::U8, in->stride(), 0));
+  job j;
+  j.what = std::string("cvtColor ") + name + " " + type_name(in->depth());
+  j.shape = shape_of(*in);
+  j.out_path = o.files[1];
+  j.call = [in, out, code = o.code] { return client::cvtColor(*in, *out, code); };
+  j.finish = [out, path = o.files[1]](mode) {
+    write_png(path, *out);
+    return std::string();
+  };
+  return j;
+}
+
+job hist_job(const options& o) {
+  const Image png = read_png(o.files[0]);
+  if (png.depth() != client::U8) throw std::runtime_error(o.files[0] + ": hist counts 8-bit samples");
+  if (o.channel >= png.channels())
+    throw usage_error("--channel " + std::to_string(o.channel) + ": " + o.files[0] + " has " +
+                      std::to_string(png.channels()) + " channel(s)");
+  // The method counts one of 1 or 2 channels; the channel of a wider pixel is copied out.
+  const int cn = png.channels() <= 2 ? png.channels() : 1;
+  const int32_t channel = png.channels() <= 2 ? o.channel : 0;
+  // Rows of at most 8192 bytes a call: a wider image goes in strips of columns, each
+  // counted into the same table.
+  const int strip_cols = 8192 / cn;
+  struct state {
+    std::vector<Image> strips;
+    client::hist256 table;
+  };
+  auto st = std::make_shared<state>();
+  for (int x0 = 0; x0 < png.cols(); x0 += strip_cols) {
+    const int w = std::min(strip_cols, png.cols() - x0);
+    Image strip(w, png.rows(), cn, client::U8);
+    for (int y = 0; y < png.rows(); ++y)
+      for (int x = 0; x < w; ++x)
+        for (int c = 0; c < cn; ++c)
+          strip.row(y)[x * cn + c] = png.row(y)[(x0 + x) * png.channels() + (cn == 1 ? o.channel : c)];
+    st->strips.push_back(std::move(strip));
+  }
+  job j;
+  j.what = "hist channel " + std::to_string(o.channel);
+  j.shape = shape_of(png);
+  j.out_path = o.plot;
+  j.call = [st, channel] {
+    AEEResult r = client::clearHist(st->table);
+    for (const Image& strip : st->strips)
+      if (r == 0) r = client::calcHist_8u1d(strip, channel, st->table);
+    return r;
+  };
+  j.finish = [st, plot = o.plot](mode) {
+    const int32_t* bins = st->table.bins;
+    std::string lines;
+    for (int v = 0; v < 256; ++v) lines += std::to_string(v) + ": " + std::to_string(bins[v]) + "\n";
+    lines += "pixels: " + std::to_string(std::accumulate(bins, bins + 256, int64_t{0})) + "\n";
+    if (!plot.empty()) {
+      // One column a bin, black bars on white, the fullest bin 100 pixels high.
+      const int64_t fullest = std::max<int64_t>(1, *std::max_element(bins, bins + 256));
+      Image chart(256, 100, 1, client::U8);
+      chart.fill(255);
+      for (int v = 0; v < 256; ++v) {
+        const int height = int((int64_t(bins[v]) * 100 + fullest / 2) / fullest);
+        for (int y = 100 - height; y < 100; ++y) chart.row(y)[v] = 0;
+      }
+      write_png(plot, chart);
+    }
     return lines;
   };
   return j;

@@ -34,6 +34,8 @@
   X(permute, deinterleave, deinterleave)         \
   X(permute, vdelta, vdelta)                     \
   X(permute, vrdelta, vrdelta)                   \
+  X(permute, vlut16, vlut16)                     \
+  X(permute, vlut16_or, vlut16_or)               \
   /* add and subtract */                         \
   X(arith, vadd, vadd)                           \
   X(arith, vsub, vsub)                           \
@@ -47,6 +49,10 @@
   X(arith, vabs, vabs)                           \
   X(arith, vmax, vmax)                           \
   X(arith, vmin, vmin)                           \
+  /* the histogram table of the register file */ \
+  X(hist, vhist, vhist)                          \
+  X(hist, vhist_pred, vhist)                     \
+  X(hist, vhist_rows, vhist_rows)                \
   /* shifts and rounding narrows */              \
   X(shift, vasr, vasr)                           \
   X(shift, vasl, vasl)                           \
@@ -69,6 +75,7 @@
   X(mul, vmpa, vmpa)                             \
   X(mul, vmpaacc, vmpaacc)                       \
   X(mul, vtmpy, vtmpy)                           \
+  X(mul, vdmpy, vdmpy)                           \
   X(mul, vdmpyacc_sat, vdmpyacc_sat)             \
   X(mul, vrmpy, vrmpy)                           \
   /* logic and predicates */                     \

@@ -16,6 +16,7 @@
 #include "core/vector/portable/move.h"
 #include "core/vector/portable/permute.h"
 #include "core/vector/portable/arith.h"
+#include "core/vector/portable/hist.h"
 #include "core/vector/portable/shift.h"
 #include "core/vector/portable/mul.h"
 #include "core/vector/portable/logic.h"

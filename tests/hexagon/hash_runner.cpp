@@ -148,6 +148,46 @@ const hash_case kCases[] = {
                                        desc(128, 128, 4), seq(128 * 4), i32(3), i32(1), i32(0), i32(0), i32(0),
                                        u32(0)}},
     {m::filter2D, "nothing", 6, {desc(128, 100, 4), seq(128 * 4), desc(128, 100, 4), seq(128 * 4), seq(9), i32(3)}},
+    // cvtColor: inDesc, in, code, outDesc, out. YUV converts each row's whole stride (Scalar:
+    // floor(stride / 3) pixels); grey reads ceil(cols * 3 / E) vectors a row and writes one
+    // vector per three (u8: 6 or 3 in, 2 or 1 out; u16: 8 or 4 in, 3 or 2 out); code 84 is served nowhere.
+    {m::cvtColor, "rgb2yuv", 5, {desc(384, 128, 5, 3), seq(384 * 5), u8(83), desc(384, 128, 5, 3), seq(384 * 5)}},
+    {m::cvtColor, "yuv2rgb_tail", 5, {desc(256, 85, 4, 3), seq(256 * 4), u8(85), desc(256, 85, 4, 3), seq(256 * 4)}},
+    {m::cvtColor, "rgb2gray_u8", 5, {desc(384, 100, 5, 3), seq(384 * 5), u8(7), desc(128, 100, 5), seq(128 * 5)}},
+    {m::cvtColor, "bgr2gray_u16", 5, {desc(512, 80, 4, 3, 2), seq(512 * 4), u8(6), desc(256, 80, 4, 1, 2),
+                                      seq(256 * 4)}},
+    {m::cvtColor, "unserved_84", 5, {desc(256, 85, 2, 3), seq(256 * 2), u8(84), desc(256, 85, 2, 3), seq(256 * 2)}},
+    // LSC: src, dst, width, height, gain024, gain135 (height / 2 + 1 gain rows); DualHVX only.
+    {m::LSC, "odd_height", 6, {seq(256 * 5), seq(256 * 5), u32(256), u32(5), seq(256 * 3), seq(256 * 3)}},
+    {m::LSC, "one_vector", 6, {seq(128 * 4), seq(128 * 4), u32(128), u32(4), seq(128 * 3), seq(128 * 3)}},
+    // integrate: inp, srcStride, width, height, outp (uint32), dstStride (bytes); DualHVX only, 2 rows refused.
+    {m::integrate, "wide_stride", 6, {seq(384 * 5), i32(384), i32(256), i32(5), seq(256 * 5), i32(1024)}},
+    {m::integrate, "padded_out", 6, {seq(128 * 3), i32(128), i32(128), i32(3), seq(160 * 3), i32(640)}},
+    {m::integrate, "two_rows", 6, {seq(128 * 2), i32(128), i32(128), i32(2), seq(128 * 2), i32(512)}},
+    // clearHist: desc, table; runs of (4 * stride) / 64 + 1 vectors, the last 64 bytes past them untouched.
+    {m::clearHist, "one_table", 2, {desc(240, 1, 1, 1, 4), seq(1024)}},
+    {m::clearHist, "three_runs", 2, {desc(256, 3, 1, 1, 4), seq(3200)}},
+    // calcHist_8u1d: input, output (added to its 0xcd bytes), channel, ranges (no effect); a tail
+    // vector, two channels, one row a block, and 3 channels (4).
+    {m::calcHist_8u1d, "1c_tail", 6, {desc(256, 200, 7), seq(256 * 7), desc(1024, 256, 1, 1, 4), seq(1024), i32(0),
+                                      seq(0)}},
+    {m::calcHist_8u1d, "2c_channel1", 6, {desc(384, 150, 5, 2), seq(384 * 5), desc(1024, 256, 1, 1, 4), seq(1024),
+                                          i32(1), seq(4)}},
+    {m::calcHist_8u1d, "5000_byte_rows", 6, {desc(5056, 5000, 3), seq(5056 * 3), desc(1024, 256, 1, 1, 4),
+                                             seq(1024), i32(0), seq(0)}},
+    {m::calcHist_8u1d, "3_channels", 6, {desc(384, 100, 2, 3), seq(384 * 2), desc(1024, 256, 1, 1, 4), seq(1024),
+                                         i32(0), seq(0)}},
+    // calcHist: input (dense whole vectors), output (bins x 128 bytes), channels, ranges (bounds of
+    // the pixels' type, here pseudo-random); channels[0] is random too, so a 2-channel image
+    // mostly counts nothing.
+    {m::calcHist, "u16_8_bins", 6, {desc(256, 128, 5, 1, 2), seq(256 * 5), desc(1024, 256, 1, 1, 4), seq(1024),
+                                    seq(1), seq(16)}},
+    {m::calcHist, "u16_tail", 6, {desc(200, 100, 3, 1, 2), seq(640), desc(512, 128, 1, 1, 4), seq(512), seq(1),
+                                  seq(8)}},
+    {m::calcHist, "f32_5_bins", 6, {desc(512, 128, 4, 1, 5), seq(512 * 4), desc(640, 160, 1, 1, 4), seq(640), seq(1),
+                                    seq(20)}},
+    {m::calcHist, "u16_2c", 6, {desc(512, 128, 4, 2, 2), seq(512 * 4), desc(512, 128, 1, 1, 4), seq(512), seq(1),
+                                seq(8)}},
     {m::get_kernel_execution_time, "plain", 4, {arg{}, arg{}, seq(16), u8(1)}},
     {m::DoesNothing_ButLooksCool, "plain", 0, {}},
     {m::DoesNothing_ButLooksCool_ProEdition, "plain", 0, {}},

@@ -191,6 +191,21 @@ CASE(deinterleave) {
 }
 CASE(vdelta) { repeat([] { auto u = rnd<V<uint8_t>>(), c = rnd<V<uint8_t>>(); SAME("u8", vdelta(u, c)); }); }
 CASE(vrdelta) { repeat([] { auto u = rnd<V<uint8_t>>(), c = rnd<V<uint8_t>>(); SAME("u8", vrdelta(u, c)); }); }
+// Segments in 0..15 and far outside (the instruction reads the low bits it needs).
+int rnd_segment() { return (next() & 1) ? static_cast<int>(next() % 16) : static_cast<int>(next()); }
+CASE(vlut16) {
+  repeat([] { auto i = rnd<V<uint8_t>>(); auto t = rnd<V<int16_t>>(); int s = rnd_segment(); SAME("i16", vlut16(i, t, s)); });
+  repeat([] { auto i = rnd<V<int8_t>>(); auto t = rnd<V<uint16_t>>(); int s = rnd_segment(); SAME("u16", vlut16(i, t, s)); });
+}
+CASE(vlut16_or) {
+  repeat([] {
+    auto a = rnd<W<int16_t>>();
+    auto i = rnd<V<uint8_t>>();
+    auto t = rnd<V<int16_t>>();
+    int s = rnd_segment();
+    SAME("i16", vlut16_or(a, i, t, s));
+  });
+}
 
 // ---- add and subtract ----
 #define BINARY_CASE(form, variant_type, ...)                                                          \
@@ -232,6 +247,52 @@ CASE(vabs) {
 }
 BINARY_CASE(vmax, V, uint8_t, uint16_t, int16_t, int32_t)
 BINARY_CASE(vmin, V, uint8_t, uint16_t, int16_t, int32_t)
+
+// ---- the histogram table: batches of 10 counts from a random table each ----
+typedef hist_table<kMode> table;
+table rnd_table() {
+  table t;
+  for (auto& r : t.r) r = rnd<V<uint16_t>>();
+  return t;
+}
+void check_tables(const char* variant, const table& got, const table& want) {
+  for (int k = 0; k < table::registers; ++k) check(variant, got.r[k], want.r[k]);
+}
+template <class F> void batches(const char* variant, F count) {
+  for (int b = 0; b < kVectors / 10; ++b) {
+    table t = rnd_table(), p = t;
+    for (int i = 0; i < 10; ++i) count(t, p);
+    check_tables(variant, t, p);
+  }
+}
+CASE(vhist) { batches("u8", [](table& t, table& p) { auto v = rnd<V<uint8_t>>(); hvx::vhist(t, v); pt::vhist(p, v); }); }
+CASE(vhist_pred) {
+  batches("q", [](table& t, table& p) { auto v = rnd<V<uint8_t>>(); auto q = rnd_pred(); hvx::vhist(t, q, v); pt::vhist(p, q, v); });
+  batches("!q", [](table& t, table& p) { auto v = rnd<V<uint8_t>>(); auto q = rnd_pred(); hvx::vhist(t, !q, v); pt::vhist(p, !q, v); });
+}
+// Up to 3 rows of up to 3 vectors and a partial one, a stride of one vector more or not.
+CASE(vhist_rows) {
+  alignas(kBytes) static uint8_t rows[3 * 5 * kBytes];
+  auto fill = [](int& width, int& stride, int& count) {
+    width = 1 + static_cast<int>(next() % (3 * kBytes + kBytes / 2));
+    stride = static_cast<int>(((width + kBytes - 1) / kBytes + next() % 2) * kBytes);
+    count = 1 + static_cast<int>(next() % 3);
+    for (int i = 0; i < stride * count; ++i) rows[i] = lane_value<uint8_t>();
+  };
+  batches("every byte", [&](table& t, table& p) {
+    int width, stride, count;
+    fill(width, stride, count);
+    hvx::vhist_rows(t, rows, stride, width, count);
+    pt::vhist_rows(p, rows, stride, width, count);
+  });
+  batches("picked", [&](table& t, table& p) {
+    int width, stride, count;
+    fill(width, stride, count);
+    auto q = rnd_pred();
+    hvx::vhist_rows(t, q, rows, stride, width, count);
+    pt::vhist_rows(p, q, rows, stride, width, count);
+  });
+}
 
 // ---- shifts and rounding narrows ----
 CASE(vasr) {
@@ -323,6 +384,7 @@ CASE(vmpaacc) {
   });
 }
 CASE(vtmpy) { repeat([] { auto bb = rnd<W<uint8_t>>(); const uint32_t w = rnd_tap_word(); SAME("u8 pair", vtmpy(bb, vi8x4(w))); }); }
+CASE(vdmpy) { repeat([] { auto u = rnd<V<uint8_t>>(); const uint32_t w = rnd_word(); SAME("ub by b", vdmpy(u, vi8x4(w))); }); }
 CASE(vdmpyacc_sat) {
   repeat([] {
     auto x = rnd<V<int32_t>>();

@@ -112,6 +112,27 @@ int morph_ex(const corvane_mbufd* d, corvane_mbuf* b, uint32_t op) {
   return corvane_morphologyEx(&d[0], &b[0], &d[0], &b[1], &d[0], &b[2], 3, 1, 0, 1, 0, op);
 }
 
+// The flat-buffer entries read their sizes from descs[0] too: LSC's width and height are
+// cols and rows; integrate's strides are descs[0].stride and descs[1].stride.
+int lsc(const corvane_mbufd* d, corvane_mbuf* b) {
+  return corvane_LSC(b[0].mem, b[0].memLen, b[1].mem, b[1].memLen, uint32_t(d[0].cols), uint32_t(d[0].rows), b[2].mem,
+                     b[2].memLen, b[3].mem, b[3].memLen);
+}
+
+int integrate(const corvane_mbufd* d, corvane_mbuf* b) {
+  return corvane_integrate(b[0].mem, b[0].memLen, d[0].stride, d[0].cols, d[0].rows,
+                           reinterpret_cast<uint32_t*>(b[1].mem), b[1].memLen / 4, d[1].stride);
+}
+
+// The channel and bounds come from the caller's constants: only the images are guarded.
+const uint8_t kChannel[1] = {0};
+const uint16_t kBounds16[4] = {100, 1000, 30000, 65535};
+const float kBounds32[3] = {0.5f, 10.0f, 1e6f};
+
+int ranged_hist(const corvane_mbufd* d, corvane_mbuf* b, const void* bounds, int bounds_bytes) {
+  return corvane_calcHist(&d[0], &b[0], &d[0], &b[1], kChannel, 1, static_cast<const uint8_t*>(bounds), bounds_bytes);
+}
+
 // Sizes chosen so that a row fills its stride in both vector lengths, which makes every
 // byte of the reach count; the box filter (3x5, H = 5) leaves its last 2 output rows
 // unwritten, and its ring holds 2 * 5 rows of two 16-bit (8-bit input) or 32-bit
@@ -196,6 +217,41 @@ std::vector<method_case> cases() {
        {negative_stride, huge_image}, [](const corvane_mbufd* d, corvane_mbuf* b) { return morph(d, b, 1); }},
       {"morphologyEx", {2, 4}, {desc(256, 256, 4)}, {4 * 256, 4 * 256, 4 * 256}, {true, true, true},
        {negative_stride, huge_image}, [](const corvane_mbufd* d, corvane_mbuf* b) { return morph_ex(d, b, 3); }},
+      // YUV: every mode converts 128 pixels a row (the stride, 384, is whole vectors and pixels).
+      // A stride of 2 or less is no work in Scalar, so only the huge image is refused everywhere.
+      {"cvtColor rgb2yuv", {0, 1, 4}, {desc(384, 128, 5, 3), desc(384, 128, 5, 3)}, {5 * 384, 5 * 384},
+       {true, true}, {huge_image},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return corvane_cvtColor(&d[0], &b[0], 83, &d[1], &b[1]); }},
+      // Grey: 384 bytes a row are 6 or 3 vectors in, 2 or 1 out (u8), 12 or 6 in, 4 or 2 out (u16).
+      {"cvtColor rgb2gray u8", {1, 4}, {desc(384, 128, 5, 3), desc(128, 128, 5)}, {5 * 384, 5 * 128}, {true, true},
+       {negative_stride, huge_image, huge_row},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return corvane_cvtColor(&d[0], &b[0], 7, &d[1], &b[1]); }},
+      {"cvtColor bgr2gray u16", {1, 4}, {desc(768, 128, 3, 3, 2), desc(256, 128, 3, 1, 2)}, {3 * 768, 3 * 256},
+       {true, true}, {negative_stride, huge_image, huge_row},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return corvane_cvtColor(&d[0], &b[0], 6, &d[1], &b[1]); }},
+      // 256 x 5 pixels; each gain plane holds rows 0 to 5 / 2.
+      {"LSC", {2, 4}, {desc(256, 256, 5)}, {5 * 256, 5 * 256, 3 * 256, 3 * 256}, {true, true, true, true},
+       {negative_rows, huge_image, huge_row}, lsc},
+      // (rows - 1) * stride + width bytes in, (rows - 1) * 1024 / 4 + width uint32 out.
+      {"integrate", {2, 4}, {desc(384, 256, 5), desc(1024, 0, 0)}, {4 * 384 + 256, 4 * (4 * 256 + 256)},
+       {true, true}, {negative_stride, negative_rows, huge_image}, integrate},
+      // Runs at 0 and 1024 bytes of 17 vectors each.
+      {"clearHist", {1, 4}, {desc(256, 2, 1, 1, 4)}, {1024 + 17 * 64}, {true}, {negative_stride, huge_image, huge_row},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return corvane_clearHist(&d[0], &b[0]); }},
+      // 130 bytes a row are read as three whole 64-byte vectors; the table is 256 int32.
+      {"calcHist_8u1d", {1, 4}, {desc(192, 65, 3, 2), desc(1024, 256, 1, 1, 4)}, {2 * 192 + 192, 1024},
+       {true, true}, {negative_stride, huge_image},
+       [](const corvane_mbufd* d, corvane_mbuf* b) {
+         return corvane_calcHist_8u1d(&d[0], &b[0], &d[1], &b[1], 1, nullptr, 0);
+       }},
+      // 512 u16 pixels are 16 or 8 whole vectors; 4 bins of 64 or 128 bytes.
+      {"calcHist u16 SingleHVX", {1}, {desc(256, 128, 4, 1, 2)}, {1024, 4 * 64}, {true, true}, {huge_image},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return ranged_hist(d, b, kBounds16, 8); }},
+      {"calcHist u16 DualHVX", {4}, {desc(256, 128, 4, 1, 2)}, {1024, 4 * 128}, {true, true}, {huge_image},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return ranged_hist(d, b, kBounds16, 8); }},
+      // 256 three-channel float pixels: 8 steps of 3 DualHVX vectors.
+      {"calcHist f32 3 channels", {4}, {desc(1536, 128, 2, 3, 5)}, {3072, 3 * 128}, {true, true}, {huge_image},
+       [](const corvane_mbufd* d, corvane_mbuf* b) { return ranged_hist(d, b, kBounds32, 12); }},
   };
 }
 
@@ -340,6 +396,31 @@ TEST(Boundary, UnservedArgumentsWriteNothing) {
        [&](corvane_mbuf* b) {
          const corvane_mbufd i32 = desc(256, 64, 4, 1, 4);
          return morph_ex(&i32, b, 2);
+       }},
+      {"cvtColor code 84", 4, 0, {1024, 1024},
+       [&](corvane_mbuf* b) { return corvane_cvtColor(&image, &b[0], 84, &image, &b[1]); }},
+      {"cvtColor grey in Scalar", 0, 1, {1024, 1024},
+       [&](corvane_mbuf* b) { return corvane_cvtColor(&image, &b[0], 7, &image, &b[1]); }},
+      {"LSC with one unit", 1, 1, {1024, 1024, 768, 768},
+       [&](corvane_mbuf* b) {
+         const corvane_mbufd d = desc(256, 256, 4);
+         return lsc(&d, b);
+       }},
+      {"integrate rows overlapping", 4, 14, {1024, 4096},
+       [&](corvane_mbuf* b) {
+         const corvane_mbufd d[] = {desc(256, 256, 4), desc(512, 0, 0)};
+         return integrate(d, b);
+       }},
+      {"calcHist_8u1d rows of 8320 bytes", 1, 4, {8320, 1024},
+       [&](corvane_mbuf* b) {
+         const corvane_mbufd d = desc(8320, 8320, 1);
+         return corvane_calcHist_8u1d(&d, &b[0], &image, &b[1], 0, nullptr, 0);
+       }},
+      {"calcHist channel 2 of 2", 4, 0, {1024, 1024},
+       [&](corvane_mbuf* b) {
+         const corvane_mbufd d = desc(256, 64, 4, 2, 2);
+         const uint8_t channel = 2;
+         return corvane_calcHist(&d, &b[0], &d, &b[1], &channel, 1, reinterpret_cast<const uint8_t*>(kBounds16), 8);
        }},
       {"sobel", 4, 0, {16, 16},
        [&](corvane_mbuf* b) { return corvane_sobel(&absurd, &b[0], &absurd, &b[1], 9, 1, 1, 7, 99); }},

@@ -12,6 +12,7 @@
 #include <initializer_list>
 #include <iterator>
 #include <string>
+#include <vector>
 
 #include "remote/method_table.h"
 #include "tools/png_io.h"
@@ -336,6 +337,94 @@ TEST_F(CliRun, MorphSubtractsOnTheHost) {
     const Image out = corvane::tools::read_png(path("out.png"));
     for (int y = 0; y < 3; ++y)
       for (int x = 0; x < 4; ++x) EXPECT_EQ(t.want(x, y), out.row(y)[x]) << "x " << x << ", y " << y;
+  }
+}
+
+TEST_F(CliRun, ColourAndHistogramTakeTheirOptionsAndFiles) {
+  Image rgb(70, 3, 3, corvane::client::U8), rgb16(30, 2, 3, corvane::client::U16), grey(40, 3, 1, corvane::client::U8),
+      g16(10, 2, 1, corvane::client::U16);
+  rgb.fill_random(31);
+  rgb16.fill_random(32);
+  grey.fill_random(33);
+  g16.fill(0);
+  const std::string out = path("out.png"), c = path("rgb.png"), g = path("grey.png");
+  for (const auto& f : {std::make_pair(c, &rgb), std::make_pair(path("rgb16.png"), &rgb16),
+                        std::make_pair(g, &grey), std::make_pair(path("g16.png"), &g16)})
+    corvane::tools::write_png(f.first, *f.second);
+  const run_case table[] = {
+      {"cvtColor --code rgb2yuv " + c + " " + out, 0, "cvtColor rgb2yuv u8  DualHVX"},
+      {"cvtColor --code yuv2rgb --mode scalar " + c + " " + out, 0, "Scalar"},
+      {"cvtColor --code rgb2gray --mode shvx " + c + " " + out, 0, "SingleHVX"},
+      {"cvtColor --code bgr2gray " + path("rgb16.png") + " " + out, 0, "bgr2gray u16"},
+      {"hist " + g, 0, "pixels: 120"},
+      {"hist --channel 2 --plot " + out + " " + c, 0, "hist channel 2  SingleHVX"},
+      {"cvtColor " + c + " " + out, 2, "wants --code"},
+      {"cvtColor --code bgr2yuv " + c + " " + out, 2, "rgb2yuv, yuv2rgb, bgr2gray, rgb2gray"},
+      {"cvtColor --code rgb2gray --mode scalar " + c + " " + out, 2, "no Scalar mode"},
+      {"cvtColor --code rgb2yuv " + g + " " + out, 1, "takes an RGB PNG of 8-bit samples"},
+      {"cvtColor --code yuv2rgb " + path("rgb16.png") + " " + out, 1, "8-bit samples"},
+      {"hist --mode scalar " + g, 2, "no Scalar mode"},
+      {"hist --channel 1 " + g, 2, "has 1 channel(s)"},
+      {"hist --channel 4 " + c, 2, "0 to 3"},
+      {"hist --code rgb2yuv " + g, 2, "not an option of hist"},
+      {"hist " + g + " " + out, 2, "wants IN.png"},
+      {"hist " + path("g16.png"), 1, "8-bit samples"},
+  };
+  check_runs(table);
+}
+
+TEST_F(CliRun, ColourAndHistogramGiveTheirFormulas) {
+  // Pixels (255, 0, 0), white, black and (10, 200, 30), converted by the formulas' integer steps.
+  write_samples(path("rgb.png"), 4, 1, 3, corvane::client::U8, {255, 0, 0, 255, 255, 255, 0, 0, 0, 10, 200, 30});
+  write_samples(path("rgb16.png"), 2, 1, 3, corvane::client::U16, {65535, 65535, 65535, 1000, 0, 0});
+  const struct {
+    std::string args;
+    std::vector<int> want;  // the output's samples, row after row
+  } table[] = {
+      {"--code rgb2yuv " + path("rgb.png"), {76, 91, 255, 255, 128, 128, 0, 128, 128, 124, 82, 28}},
+      {"--code yuv2rgb " + path("rgb.png"), {109, 255, 0, 255, 131, 255, 0, 125, 0, 0, 38, 156}},
+      {"--code rgb2gray " + path("rgb.png"), {76, 255, 0, 124}},
+      {"--code bgr2gray " + path("rgb.png"), {29, 255, 0, 128}},
+      {"--code rgb2gray " + path("rgb16.png"), {65535, 299}},
+      {"--code bgr2gray " + path("rgb16.png"), {65535, 114}},
+  };
+  for (const auto& t : table)
+    for (const char* mode : {"scalar", "shvx", "dhvx"}) {
+      const bool grey = t.args.find("gray") != std::string::npos;
+      if (grey && std::string(mode) == "scalar") continue;  // the grey codes have no Scalar mode
+      SCOPED_TRACE(t.args + " " + mode);
+      ASSERT_EQ(0, cli("run cvtColor --mode " + std::string(mode) + " " + t.args + " " + path("out.png"))) << output_;
+      const Image out = corvane::tools::read_png(path("out.png"));
+      const size_t n = out.row_bytes() / size_t(corvane::client::element_size(out.depth()));
+      ASSERT_EQ(t.want.size(), n);
+      for (size_t i = 0; i < n; ++i) {
+        const int got = out.depth() == corvane::client::U8 ? out.row(0)[i]
+                                                            : reinterpret_cast<const uint16_t*>(out.row(0))[i];
+        EXPECT_EQ(t.want[i], got) << "sample " << i;
+      }
+    }
+
+  // A 9000-byte grey row is counted in two strips into one table; the alpha channel of a
+  // grey + alpha file on its own; the chart's bars scale to the fullest bin.
+  Image wide(9000, 2, 1, corvane::client::U8);
+  wide.fill(7);
+  wide.row(1)[8999] = 250;
+  corvane::tools::write_png(path("wide.png"), wide);
+  write_samples(path("ga.png"), 3, 1, 2, corvane::client::U8, {1, 40, 2, 40, 3, 90});
+  ASSERT_EQ(0, cli("run hist " + path("wide.png"))) << output_;
+  EXPECT_NE(std::string::npos, output_.find("\n7: 17999\n")) << output_;
+  EXPECT_NE(std::string::npos, output_.find("\n250: 1\n")) << output_;
+  ASSERT_EQ(0, cli("run hist --channel 1 --plot " + path("chart.png") + " " + path("ga.png"))) << output_;
+  EXPECT_NE(std::string::npos, output_.find("\n40: 2\n")) << output_;
+  EXPECT_NE(std::string::npos, output_.find("\n90: 1\n")) << output_;
+  EXPECT_NE(std::string::npos, output_.find("pixels: 3\n")) << output_;
+  const Image chart = corvane::tools::read_png(path("chart.png"));
+  ASSERT_EQ(256, chart.cols());
+  ASSERT_EQ(100, chart.rows());
+  for (int y = 0; y < 100; ++y) {
+    EXPECT_EQ(0, chart.row(y)[40]) << y;
+    EXPECT_EQ(y < 50 ? 255 : 0, chart.row(y)[90]) << y;
+    EXPECT_EQ(255, chart.row(y)[1]) << y;
   }
 }
 

@@ -14,6 +14,7 @@
 #include <hvx_hexagon_protos.h>
 
 #include "core/vector/portable/arith.h"
+#include "core/vector/portable/hist.h"
 #include "core/vector/portable/logic.h"
 #include "core/vector/portable/move.h"
 #include "core/vector/portable/mul.h"
@@ -244,6 +245,20 @@ template <class V> inline if_plain<V> vrdelta(V u, V v) {
   else return from<V>(Q6_V_vrdelta_VV(to_v(u), to_v(v)));
 }
 
+template <class V, class T> inline portable::impl::lut16_result<V, T> vlut16(V idx, T table, int seg) {
+  using namespace hvx_backend;
+  if constexpr (!native<V>) return portable::vlut16(idx, table, seg);
+  else return from<wide_of<T>>(Q6_Wh_vlut16_VbVhR(to_v(idx), to_v(table), seg));
+}
+
+template <class W, class V, class T>
+inline nstd::on_if_t<nstd::is_same_c<W, portable::impl::lut16_result<V, T>>::value, W> vlut16_or(W acc, V idx, T table,
+                                                                                                 int seg) {
+  using namespace hvx_backend;
+  if constexpr (!native<V>) return portable::vlut16_or(acc, idx, table, seg);
+  else return from<W>(Q6_Wh_vlut16or_WhVbVhR(to_w(acc), to_v(idx), to_v(table), seg));
+}
+
 // ---- add and subtract -------------------------------------------------------------------
 
 template <class V> inline nstd::on_if_t<is_int_lane<V>, if_plain<V>> vadd(V u, V v) {
@@ -339,6 +354,108 @@ template <class V> inline if_lanes<V, uint8_t, uint16_t, int16_t, int32_t> vmin(
   else if constexpr (lane_in<L, int16_t>) return from<V>(Q6_Vh_vmin_VhVh(to_v(u), to_v(v)));
   else return from<V>(Q6_Vw_vmin_VwVw(to_v(u), to_v(v)));
 }
+
+// ---- the histogram table of the register file ----------------------------------------------
+// vhist has no operands: it counts the vector that a .tmp load in its packet brings into
+// the table held in v0..v31. Each form is one asm statement that loads the table from
+// memory, counts, and stores it back; every vector register is declared clobbered, so no
+// compiled vector code runs while the table is in the registers.
+
+#define CORVANE_HVX_TABLE_LOAD(k) "v" #k " = vmem(%[p]++#1)\n"
+#define CORVANE_HVX_TABLE_STORE(k) "vmem(%[p]++#1) = v" #k "\n"
+#define CORVANE_HVX_EACH_REGISTER(F)                                                                               \
+  F(0) F(1) F(2) F(3) F(4) F(5) F(6) F(7) F(8) F(9) F(10) F(11) F(12) F(13) F(14) F(15) F(16) F(17) F(18) F(19) \
+  F(20) F(21) F(22) F(23) F(24) F(25) F(26) F(27) F(28) F(29) F(30) F(31)
+#define CORVANE_HVX_TABLE_IN "%[p] = %[t]\n" CORVANE_HVX_EACH_REGISTER(CORVANE_HVX_TABLE_LOAD)
+#define CORVANE_HVX_TABLE_OUT "%[p] = %[t]\n" CORVANE_HVX_EACH_REGISTER(CORVANE_HVX_TABLE_STORE)
+#define CORVANE_HVX_TABLE_REGISTERS                                                                               \
+  "v0", "v1", "v2", "v3", "v4", "v5", "v6", "v7", "v8", "v9", "v10", "v11", "v12", "v13", "v14", "v15", "v16",  \
+  "v17", "v18", "v19", "v20", "v21", "v22", "v23", "v24", "v25", "v26", "v27", "v28", "v29", "v30", "v31"
+
+namespace hvx_backend {
+// q0 = the selected lanes of the byte mask at %[m] (v0 is loaded before the table).
+#define CORVANE_HVX_PICK "v0 = vmem(%[m]+#0)\nq0 = vand(v0, %[ones])\n"
+
+// `count` rows of `width` bytes, `stride` apart from src, counted where `mask` selects
+// (q0), the last partial vector of a row under q1 = q0 and vsetq(width mod N).
+inline void hist_rows(void* t, const hv_t& mask, const uint8_t* src, int stride, int width, int count) {
+  if (count <= 0 || width <= 0) return;
+  const int full = width / __HVX_LENGTH__, tail = width % __HVX_LENGTH__;
+  void* p;
+  int k;
+  asm volatile(CORVANE_HVX_PICK
+               "q1 = vsetq(%[tail])\n"
+               "q1 = and(q1, q0)\n" CORVANE_HVX_TABLE_IN
+               "1:\n"
+               "{ %[p] = %[src]; %[k] = %[full] }\n"
+               "{ p0 = cmp.gt(%[k], #0); if (!p0.new) jump:nt 3f }\n"
+               "2:\n"
+               "{ v0.tmp = vmem(%[p]++#1); vhist(q0) }\n"
+               "{ %[k] = add(%[k], #-1) }\n"
+               "{ p0 = cmp.gt(%[k], #0); if (p0.new) jump:t 2b }\n"
+               "3:\n"
+               "{ p0 = cmp.gt(%[tail], #0); if (!p0.new) jump:nt 4f }\n"
+               "{ v0.tmp = vmem(%[p]+#0); vhist(q1) }\n"
+               "4:\n"
+               "{ %[src] = add(%[src], %[stride]); %[count] = add(%[count], #-1) }\n"
+               "{ p0 = cmp.gt(%[count], #0); if (p0.new) jump:t 1b }\n" CORVANE_HVX_TABLE_OUT
+               : [p] "=&r"(p), [k] "=&r"(k), [src] "+r"(src), [count] "+r"(count)
+               : [t] "r"(t), [m] "r"(&mask), [ones] "r"(-1), [full] "r"(full), [tail] "r"(tail), [stride] "r"(stride)
+               : CORVANE_HVX_TABLE_REGISTERS, "q0", "q1", "p0", "memory");
+}
+}  // namespace hvx_backend
+
+template <mode_enum M, class V> inline void vhist(hist_table<M>& t, V v) {
+  using namespace hvx_backend;
+  static_assert(nstd::is_same_c<V, vu8_t<M>>::value, "bytes of the table's mode");
+  if constexpr (!native<V>) {
+    portable::vhist(t, v);
+  } else {
+    const hv_t in = to_v(v);
+    void* p;
+    asm volatile(CORVANE_HVX_TABLE_IN "{ v0.tmp = vmem(%[in]+#0); vhist }\n" CORVANE_HVX_TABLE_OUT
+                 : [p] "=&r"(p)
+                 : [t] "r"(&t), [in] "r"(&in)
+                 : CORVANE_HVX_TABLE_REGISTERS, "memory");
+  }
+}
+
+template <mode_enum M, bool Neg, class V> inline void vhist(hist_table<M>& t, gen_pred_vec<M, Neg> q, V v) {
+  using namespace hvx_backend;
+  static_assert(nstd::is_same_c<V, vu8_t<M>>::value, "bytes of the table's mode");
+  if constexpr (!native<V>) {
+    portable::vhist(t, q, v);
+  } else {
+    const hv_t in = to_v(v), mask = to_q(q);
+    void* p;
+    asm volatile(CORVANE_HVX_PICK CORVANE_HVX_TABLE_IN "{ v0.tmp = vmem(%[in]+#0); vhist(q0) }\n" CORVANE_HVX_TABLE_OUT
+                 : [p] "=&r"(p)
+                 : [t] "r"(&t), [in] "r"(&in), [m] "r"(&mask), [ones] "r"(-1)
+                 : CORVANE_HVX_TABLE_REGISTERS, "q0", "memory");
+  }
+}
+
+template <mode_enum M> inline void vhist_rows(hist_table<M>& t, const uint8_t* src, int stride, int width, int count) {
+  using namespace hvx_backend;
+  if constexpr (!native<vu8_t<M>>) portable::vhist_rows(t, src, stride, width, count);
+  else hist_rows(&t, Q6_V_vsplat_R(-1), src, stride, width, count);
+}
+
+template <mode_enum M, bool Neg>
+inline void vhist_rows(hist_table<M>& t, gen_pred_vec<M, Neg> pick, const uint8_t* src, int stride, int width,
+                       int count) {
+  using namespace hvx_backend;
+  if constexpr (!native<vu8_t<M>>) portable::vhist_rows(t, pick, src, stride, width, count);
+  else hist_rows(&t, to_q(pick), src, stride, width, count);
+}
+
+#undef CORVANE_HVX_PICK
+#undef CORVANE_HVX_TABLE_REGISTERS
+#undef CORVANE_HVX_TABLE_OUT
+#undef CORVANE_HVX_TABLE_IN
+#undef CORVANE_HVX_EACH_REGISTER
+#undef CORVANE_HVX_TABLE_STORE
+#undef CORVANE_HVX_TABLE_LOAD
 
 // ---- shifts and rounding narrows ----------------------------------------------------------
 
@@ -492,6 +609,13 @@ template <class P> inline portable::impl::taps_result<if_pair_lanes<P, uint8_t>>
   using namespace hvx_backend;
   if constexpr (!native_pair<P>) return portable::vtmpy(uu, rt);
   else return from<portable::impl::taps_result<P>>(Q6_Wh_vtmpy_WubRb(to_w(uu), static_cast<int>(rt.value)));
+}
+
+template <class V, class R = vector_type<int16_t, V::bytes>>
+inline nstd::on_if_t<lane_is_one_of<typename if_plain<V>::lane_t, uint8_t>, R> vdmpy(V u, vi8x4 rt) {
+  using namespace hvx_backend;
+  if constexpr (!native<V>) return portable::vdmpy(u, rt);
+  else return from<R>(Q6_Vh_vdmpy_VubRb(to_v(u), static_cast<int>(rt.value)));
 }
 
 template <class V, class H> inline if_lanes<V, int32_t> vdmpyacc_sat(V x, H u, vu16x2 rt) {

@@ -28,7 +28,7 @@ __attribute__((always_inline)) inline x86::bytes join_chunks(x86::bytes a, x86::
   return __builtin_shuffle(a, b, m);
 #endif
 }
-// align_bytes for a shift known when compiling (0 < s mod chunk_bytes, s < N): each chunk
+// align_bytes for a shift known when compiling (0 < s < N): each chunk
 // of the result is two neighbouring chunks of the run joined, in registers; no round
 // trip through memory.
 template <class V> __attribute__((always_inline)) inline V align_bytes_fixed(const V& u, const V& v, size_t s) {
@@ -39,7 +39,7 @@ template <class V> __attribute__((always_inline)) inline V align_bytes_fixed(con
     const size_t k = c + q;  // chunks k and k + 1 of the run v, u
     const x86::bytes a = k < n ? ld<char>(v, k) : ld<char>(u, k - n);
     const x86::bytes b = k + 1 < n ? ld<char>(v, k + 1) : ld<char>(u, k + 1 - n);
-    st(out, c, join_chunks(a, b, r));
+    st(out, c, r == 0 ? a : join_chunks(a, b, r));  // whole chunks: a plain selection
   });
   return out;
 }
@@ -48,7 +48,7 @@ template <class V> __attribute__((always_inline)) inline V align_bytes_fixed(con
 // that holds both vectors, which beats any run-time shuffle on SSE2.
 template <class V> inline V align_bytes(const V& u, const V& v, size_t s) {
 #if CORVANE_GCC_SSE2 && defined(__OPTIMIZE__)
-  if (__builtin_constant_p(s) && s % chunk_bytes != 0 && s < sizeof(V)) return align_bytes_fixed(u, v, s);
+  if (__builtin_constant_p(s) && s != 0 && s < sizeof(V)) return align_bytes_fixed(u, v, s);
 #endif
   alignas(chunk_bytes) uint8_t cat[2 * sizeof(V)];
   __builtin_memcpy(cat, &v, sizeof(V));

@@ -106,12 +106,17 @@ template <class V> inline if_lanes<V, int16_t, int32_t> vmpyiacc(V x, V u, vi8x4
 }
 
 // vmpye: r[i] = (u[i] * v.uh[2i]) >> 16, the upper 32 bits of the 48-bit product.  HVX: vmpye(Vu.w,Vv.uh)
+// In 32-bit lanes, with u = 2^16 uh + ul: (u * f) >> 16 = uh * f + ((ul * f) >> 16)
+// exactly (ul * f fits 32 unsigned bits), and the sum, which fits, wraps to it.
 template <class V, class H> inline if_lanes<V, int32_t> vmpye(V u, H v) {
   static_assert(nstd::is_same_c<H, vector_type<uint16_t, V::bytes>>::value, "factor vector of u16 lanes");
-  V r;
-  for (size_t i = 0; i < V::lanes; ++i)
-    r.value[i] = static_cast<int32_t>((static_cast<int64_t>(u.value[i]) * v.value[2 * i]) >> 16);
-  return r;
+  return map_chunks<int32_t, V>(
+      [](chunk<int32_t> a, chunk<int32_t> b) {
+        const uchunk<int32_t> f = (uchunk<int32_t>)b & 0xffff;
+        return add_wrap<int32_t>(mul_wrap<int32_t>(a >> 16, (chunk<int32_t>)f),
+                                 (chunk<int32_t>)(((uchunk<int32_t>)a & 0xffff) * f >> 16));
+      },
+      u, v);
 }
 
 // vmpyie: r[i] = u[i] * v.uh[2i], low 32 bits.  HVX: vmpyie(Vu.w,Vv.uh)
@@ -191,6 +196,21 @@ template <class P> inline impl::taps_result<if_pair_lanes<P, uint8_t>> vtmpy(P u
   return impl::taps<impl::taps_result<P>>(
       uu, [tap3](chunk<uint16_t> a, chunk<uint16_t> b, chunk<uint16_t> c, chunk<uint16_t>) { return tap3(a, b, c); },
       [tap3](chunk<uint16_t>, chunk<uint16_t> b, chunk<uint16_t> c, chunk<uint16_t> d) { return tap3(b, c, d); });
+}
+
+// vdmpy: r[i] = u[2i] * rt.b[(2i) mod 4] + u[2i+1] * rt.b[(2i+1) mod 4]; unsigned bytes
+// by signed bytes into i16 lanes, wrapping. Half-word i of the word splat holds exactly
+// those two factor bytes.  HVX: vdmpy(Vu.ub,Rt.b)
+template <class V, class R = vector_type<int16_t, V::bytes>>
+inline nstd::on_if_t<lane_is_one_of<typename if_plain<V>::lane_t, uint8_t>, R> vdmpy(V u, vi8x4 rt) {
+  const chunk<int16_t> f = splat_word<int16_t>(rt.value);
+  const chunk<int16_t> f0 = even_lanes<int16_t>(f), f1 = odd_lanes<int16_t>(f);
+  return map_chunks<int16_t, R>(
+      [f0, f1](chunk<int16_t> a) {
+        const chunk<int16_t> low = (chunk<int16_t>)((uchunk<int16_t>)a & 0xff), high = (chunk<int16_t>)((uchunk<int16_t>)a >> 8);
+        return add_wrap<int16_t>(mul_wrap<int16_t>(low, f0), mul_wrap<int16_t>(high, f1));
+      },
+      u);
 }
 
 // vdmpyacc_sat: r[i] = sat(x[i] + u[2i] * rt.uh[0] + u[2i+1] * rt.uh[1]); i16 lanes by

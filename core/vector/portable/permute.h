@@ -155,6 +155,69 @@ template <class V> inline if_plain<V> vdelta(V u, V v) { return impl::delta_netw
 // vrdelta: the same network with o rising from 1 to N/2.  HVX: vrdelta(Vu,Vv)
 template <class V> inline if_plain<V> vrdelta(V u, V v) { return impl::delta_network(u, v, true); }
 
+namespace impl {
+// The 16 half-words that a vlut16 segment can select, entry j in lane j of a chunk of
+// 16-bit lanes (two chunks at 16 bytes; at 64 bytes the entries fill lanes 16..31
+// again): half `odd` of the 16 words from chunk `first` of the table on, 64 bytes.
+constexpr size_t lut16_chunks = chunk_bytes == 16 ? 2 : 1;
+template <class T> inline void lut16_entries(const T& table, size_t first, bool odd, chunk<uint16_t> (&t)[lut16_chunks]) {
+  const nstd::make_integer_sequence<size_t, chunk_bytes / 2> lanes{};
+  auto halves = [&](size_t a, size_t b) {
+    const chunk<uint16_t> x = ld<uint16_t>(table, a), y = ld<uint16_t>(table, b);
+    return odd ? every_other<uint16_t, 1>(x, y, lanes) : every_other<uint16_t, 0>(x, y, lanes);
+  };
+  if constexpr (chunk_bytes == 64) t[0] = halves(first, first);
+  if constexpr (chunk_bytes == 32) t[0] = halves(first, first + 1);
+  if constexpr (chunk_bytes == 16) t[0] = halves(first, first + 1), t[1] = halves(first + 2, first + 3);
+}
+
+// Entry b[i] & 15 of t. GCC takes a shuffle mask modulo the lanes (vpermw and kin); clang
+// has no run-time shuffle, and the baseline (SSE2) no byte shuffle: lane by lane there.
+inline chunk<uint16_t> lut16_pick(const chunk<uint16_t> (&t)[lut16_chunks], chunk<uint16_t> b) {
+#if !defined(__clang__)
+  if constexpr (chunk_bytes > 16) return __builtin_shuffle(t[0], b);
+#endif
+  constexpr size_t per = chunk_bytes / 2;
+  chunk<uint16_t> r;
+  for (size_t i = 0; i < per; ++i) r[i] = t[(b[i] & 15) / per % lut16_chunks][(b[i] & 15) % per];
+  return r;
+}
+
+// vlut16 on 16-bit lanes: a byte b that matches the segment lies in 16 seg .. 16 seg + 15,
+// so the word b mod (N/4) that it reads is entry b & 15 of the 16 words from
+// (16 seg) mod (N/4) on.
+template <class W, class V, class T> inline W lut16(V idx, T table, int seg) {
+  constexpr size_t n = sizeof(T);
+  const uint16_t match = static_cast<uint16_t>(seg & 15);
+  const bool odd = ((static_cast<unsigned>(seg) >> (n == 128 ? 1 : 0)) & 1) != 0;
+  chunk<uint16_t> t[lut16_chunks];
+  lut16_entries(table, (16u * match) % (n / 4) * 4 / chunk_bytes, odd, t);
+  auto look = [&](chunk<uint16_t> b) { return lut16_pick(t, b) & (chunk<uint16_t>)((b >> 4) == match); };
+  return map_even_odd<uint16_t, W>([&](chunk<uint16_t> x) { return look(x & 0xff); },
+                                   [&](chunk<uint16_t> x) { return look(x >> 8); }, idx);
+}
+template <class V, class T> using lut16_result =
+    nstd::on_if_t<lane_is_one_of<typename if_plain<V>::lane_t, uint8_t, int8_t> && V::bytes == T::bytes,
+                  wide_of<if_lanes<T, int16_t, uint16_t>>>;
+}  // namespace impl
+
+// vlut16: for each byte b = idx[k] (unsigned), with the segment match (b >> 4) == (seg &
+// 15): half (seg >> (log2(N) - 6)) & 1 of 32-bit word b mod (N/4) of table where it
+// matches, else 0; even/odd: lo[i] from idx[2i], hi[i] from idx[2i+1]. So with N = 128
+// one table vector serves four segments: words 0..15 the even ones, 16..31 the odd ones,
+// the low half-word where seg bit 1 is clear; the instruction reads no other bit of seg.
+// HVX: vlut16(Vu.b,Vv.h,Rt)
+template <class V, class T> inline impl::lut16_result<V, T> vlut16(V idx, T table, int seg) {
+  return impl::lut16<wide_of<T>>(idx, table, seg);
+}
+
+// vlut16_or: acc | vlut16(idx, table, seg), bitwise.  HVX: vlut16(Vu.b,Vv.h,Rt) or-accumulating
+template <class W, class V, class T>
+inline nstd::on_if_t<nstd::is_same_c<W, impl::lut16_result<V, T>>::value, W> vlut16_or(W acc, V idx, T table, int seg) {
+  return map_chunks<uint16_t, W>([](chunk<uint16_t> a, chunk<uint16_t> b) { return a | b; }, acc,
+                                 impl::lut16<W>(idx, table, seg));
+}
+
 }  // namespace portable
 CORVANE_ISA_END
 }  // namespace hvx

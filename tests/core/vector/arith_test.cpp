@@ -243,4 +243,58 @@ LANE_TEST(VectorShift, vhalf2vfloat) {
   expect_lanes(hvx::vhalf2vfloat(u), want);
 }
 
+// ---- the histogram table: counter (b & 7) of 128-bit lane j / 16 of register b >> 3 ----
+
+template <class S> size_t hist_counter(size_t j, uint8_t b) { return (b >> 3) * (S::n / 2) + j / 16 * 8 + (b & 7); }
+template <class S> hvx::hist_table<S::mode> rand_table(std::mt19937& g) {
+  hvx::hist_table<S::mode> t;
+  for (auto& r : t.r) r = rand_vec<typename S::template v<uint16_t>>(g);  // max lanes: wrapping counts
+  return t;
+}
+
+LANE_TEST(VectorHist, vhist) {
+  typedef typename S::template v<uint8_t> V;
+  auto t = rand_table<S>(g);
+  const V v = rand_vec<V>(g);
+  std::vector<uint16_t> want = lanes<uint16_t>(t);
+  for (size_t j = 0; j < S::n; ++j) ++want[hist_counter<S>(j, v[j])];
+  hvx::vhist(t, v);
+  expect_lanes(t, want);
+}
+
+LANE_TEST(VectorHist, vhist_pred) {
+  typedef typename S::template v<uint8_t> V;
+  auto t = rand_table<S>(g);
+  const V v = rand_vec<V>(g);
+  const std::vector<bool> on = rand_flags<S>(g);
+  std::vector<uint16_t> want = lanes<uint16_t>(t);
+  for (size_t j = 0; j < S::n; ++j) want[hist_counter<S>(j, v[j])] += on[j] ? 2 : 1;
+  const auto q = make_pred<S>(on);
+  hvx::vhist(t, q, v);
+  hvx::vhist(t, q, v);
+  hvx::vhist(t, !q, v);
+  expect_lanes(t, want);
+}
+
+LANE_TEST(VectorHist, vhist_rows) {
+  const int width = 1 + int(g() % (3 * S::n)), rows = 1 + int(g() % 3);
+  const int stride = int(((width + S::n - 1) / S::n + g() % 2) * S::n);
+  std::vector<uint8_t> store(size_t(stride) * rows + S::n);
+  uint8_t* src = store.data() + (S::n - reinterpret_cast<uintptr_t>(store.data()) % S::n) % S::n;
+  for (int i = 0; i < stride * rows; ++i) src[i] = rand_lane<uint8_t>(g);
+  const std::vector<bool> on = rand_flags<S>(g);
+  auto every = rand_table<S>(g), picked = every;
+  std::vector<uint16_t> want_every = lanes<uint16_t>(every), want_picked = want_every;
+  for (int y = 0; y < rows; ++y)
+    for (int x = 0; x < width; ++x) {
+      const size_t j = size_t(x) % S::n, c = hist_counter<S>(j, src[y * stride + x]);
+      ++want_every[c];
+      want_picked[c] += on[j];
+    }
+  hvx::vhist_rows(every, src, stride, width, rows);
+  hvx::vhist_rows(picked, make_pred<S>(on), src, stride, width, rows);
+  expect_lanes(every, want_every);
+  expect_lanes(picked, want_picked);
+}
+
 }  // namespace

@@ -352,4 +352,55 @@ LANE_TEST(VectorPermute, vrdelta) {
   expect_lanes(hvx::vrdelta(u, v), delta(lanes<uint8_t>(u), lanes<uint8_t>(v), true));
 }
 
+// vlut16 lanes in pair order (lo, then hi): byte b of idx matches where b >> 4 is
+// seg & 15 and then reads half (seg >> (log2 N - 6)) & 1 of word b mod (N/4).
+std::vector<int16_t> lut16(const std::vector<uint8_t>& idx, const std::vector<int16_t>& table, int seg) {
+  const size_t n = idx.size(), half = (static_cast<unsigned>(seg) >> (n == 128 ? 1 : 0)) & 1;
+  std::vector<int16_t> r(n);
+  for (size_t k = 0; k < n; ++k) {
+    const uint8_t b = idx[k];
+    r[(k % 2) * (n / 2) + k / 2] = (b >> 4) == (seg & 15) ? table[2 * (b % (n / 4)) + half] : 0;
+  }
+  return r;
+}
+int rand_segment(std::mt19937& g) { return g() % 2 ? static_cast<int>(g() % 16) : static_cast<int>(g()); }
+
+LANE_TEST(VectorPermute, vlut16) {
+  typedef typename S::template v<uint8_t> V;
+  typedef typename S::template v<int16_t> T;
+  const V idx = rand_vec<V>(g);
+  const T table = rand_vec<T>(g);
+  const int seg = rand_segment(g);
+  expect_lanes(hvx::vlut16(idx, table, seg), lut16(lanes<uint8_t>(idx), lanes<int16_t>(table), seg));
+
+  // Half-word h of the table holds 1000 + h; idx bytes k = 0, 1, 2, ... (mod 256).
+  std::vector<int16_t> h(S::n / 2);
+  for (size_t i = 0; i < h.size(); ++i) h[i] = static_cast<int16_t>(1000 + i);
+  std::vector<uint8_t> ramp(S::n);
+  for (size_t k = 0; k < S::n; ++k) ramp[k] = static_cast<uint8_t>(k);
+  struct pin { int seg; uint8_t byte; int16_t want; };
+  const pin pins[] = {  // the byte's own lane: lo[byte / 2] or hi[byte / 2]
+      {0, 5, 1010}, {1, 17, S::n == 128 ? 1034 : 1003}, {2, 33, S::n == 128 ? 1003 : 1002},
+      {3, 63, S::n == 128 ? 1063 : 1031}, {2, 5, 0}, {16 + 3, 50, S::n == 128 ? 1037 : 1005}};
+  for (const pin& p : pins) {
+    const auto got = lanes<int16_t>(hvx::vlut16(from_lanes<V>(ramp), from_lanes<T>(h), p.seg));
+    EXPECT_EQ(p.want, got[(p.byte % 2) * (S::n / 2) + p.byte / 2]) << "seg " << p.seg << ", byte " << +p.byte;
+  }
+}
+
+LANE_TEST(VectorPermute, vlut16_or) {
+  typedef typename S::template v<uint8_t> V;
+  typedef typename S::template v<uint16_t> T;
+  typedef typename S::template w<uint16_t> P;
+  const V idx = rand_vec<V>(g);
+  const T table = rand_vec<T>(g);
+  const P acc = rand_vec<P>(g);
+  const int seg = rand_segment(g);
+  const auto t = lanes<uint16_t>(table);
+  auto want = lut16(lanes<uint8_t>(idx), std::vector<int16_t>(t.begin(), t.end()), seg);
+  const auto a = lanes<uint16_t>(acc);
+  for (size_t i = 0; i < want.size(); ++i) want[i] = static_cast<int16_t>(want[i] | a[i]);
+  expect_lanes(hvx::vcast<typename S::template w<int16_t>>(hvx::vlut16_or(acc, idx, table, seg)), want);
+}
+
 }  // namespace

@@ -189,6 +189,32 @@ LANE_TEST(VectorMul, vtmpy) {
   expect_lanes(hvx::vtmpy(uu, hvx::vi8x4(w)), want);
 }
 
+LANE_TEST(VectorMul, vdmpy) {
+  typedef typename S::template v<uint8_t> V;
+  const V u = rand_vec<V>(g);
+  const uint32_t w = rand_word(g);
+  const auto a = lanes<uint8_t>(u);
+  auto f = [&](size_t j) { return static_cast<int8_t>(w >> 8 * (j % 4)); };  // byte j's factor
+  std::vector<int16_t> want(a.size() / 2);
+  for (size_t i = 0; i < want.size(); ++i) want[i] = wrap<int16_t>(int64_t{a[2 * i]} * f(2 * i) + int64_t{a[2 * i + 1]} * f(2 * i + 1));
+  expect_lanes(hvx::vdmpy(u, hvx::vi8x4(w)), want);
+
+  // Every byte `fill`: even lanes take factor bytes 0 and 1, odd lanes 2 and 3.
+  struct pin { uint8_t fill; uint32_t word; int16_t even, odd; };
+  const pin pins[] = {
+      {255, 0x01010101u, 510, 510},      // the pair sums of an integral image
+      {255, 0x7f7f7f7fu, -766, -766},    // 64770 wraps
+      {255, 0x80808080u, 256, 256},      // -65280 wraps
+      {10, 0x04030201u, 30, 70},
+      {200, 0x00ff0100u, 200, -200},
+  };
+  for (const pin& p : pins) {
+    std::vector<int16_t> lanes16(a.size() / 2);
+    for (size_t i = 0; i < lanes16.size(); ++i) lanes16[i] = i % 2 ? p.odd : p.even;
+    expect_lanes(hvx::vdmpy(from_lanes<V>(std::vector<uint8_t>(a.size(), p.fill)), hvx::vi8x4(p.word)), lanes16);
+  }
+}
+
 LANE_TEST(VectorMul, vdmpyacc_sat) {
   typedef typename S::template v<int32_t> V;
   typedef typename S::template v<int16_t> V16;

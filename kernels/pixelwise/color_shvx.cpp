@@ -1,0 +1,3 @@
+#include "kernels/pixelwise/color_impl.h"
+// run only: the rest of the class (reach) is baseline code, made where it is called.
+template AEEResult cv::adsp::cvtColor<hvx::SingleHVX>::run(hvx::for_mode<hvx::SingleHVX>, gen_in, gen_out, int32_t);
